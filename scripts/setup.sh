@@ -1,0 +1,38 @@
+#!/usr/bin/env bash
+# Installs, from Debian's archive, every package that the build, the tests,
+# the benchmarks and the demo need. Safe to run again: it only installs
+# what is missing.
+set -euo pipefail
+
+packages=(
+  # toolchain
+  build-essential cmake pkg-config clang-format
+  # image work (libopencv-dev carries OpenCV's CMake package)
+  libopencv-dev
+  libtbb-dev
+  # host side: JDK, OpenCV's Java binding, JUnit 5
+  openjdk-17-jdk-headless libopencv-java libopencv406-jni junit5
+  # C++ tests and benchmarks
+  libgtest-dev libgmock-dev libbenchmark-dev
+  # headless drawing: EGL + GLES2 on Mesa's software rasteriser
+  libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
+  # text: glyphs, shaping, bidi, and fonts for Latin, CJK, Arabic, Hebrew
+  libfreetype-dev libharfbuzz-dev libfribidi-dev
+  fonts-noto-cjk fonts-wqy-microhei fonts-noto-core fonts-dejavu-core
+)
+
+missing=()
+for p in "${packages[@]}"; do
+  dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
+done
+
+if [ ${#missing[@]} -eq 0 ]; then
+  exit 0
+fi
+
+sudo_cmd=()
+[ "$(id -u)" -eq 0 ] || sudo_cmd=(sudo)
+echo "setup: installing ${missing[*]}"
+export DEBIAN_FRONTEND=noninteractive
+"${sudo_cmd[@]}" apt-get update -qq
+"${sudo_cmd[@]}" apt-get install -y -qq --no-install-recommends "${missing[@]}" >/dev/null

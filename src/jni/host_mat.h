@@ -1,0 +1,16 @@
+#pragma once
+
+#include <jni.h>
+
+#include <opencv2/core/mat.hpp>
+
+namespace ocr::jni {
+
+// The host owns its matrices and passes them by native address (what
+// org.opencv.core.Mat#getNativeObjAddr returns); the engine reads from them
+// and assigns into them but never frees them.
+inline cv::Mat& HostMat(jlong address) {
+  return *reinterpret_cast<cv::Mat*>(address);
+}
+
+}  // namespace ocr::jni
