@@ -200,18 +200,26 @@ void CompositeOverlay(const cv::Mat& overlay, const cv::RotatedRect& rect, cv::M
   cv::Size size;
   cv::Mat to_image;
   ocr_inpainting::GetSizeAndTransform(rect, size, to_image, ocr_inpainting::kLinePatchCap);
+  // Premultiplied, so that interpolation across the patch border does not
+  // mix the transparent outside's colour into the overlay.
+  cv::Mat premultiplied;
+  overlay.convertTo(premultiplied, CV_32FC4, 1.0 / 255.0);
+  std::vector<cv::Mat> channels;
+  cv::split(premultiplied, channels);
+  for (int ch = 0; ch < 3; ++ch)
+    channels[ch] = channels[ch].mul(channels[3]);
+  cv::merge(channels, premultiplied);
   cv::Mat warped;
-  cv::warpAffine(overlay, warped, to_image, frame.size(), cv::INTER_LINEAR, cv::BORDER_CONSTANT,
-                 cv::Scalar::all(0));
+  cv::warpAffine(premultiplied, warped, to_image, frame.size(), cv::INTER_LINEAR,
+                 cv::BORDER_CONSTANT, cv::Scalar::all(0));
   for (int y = 0; y < frame.rows; ++y) {
     for (int x = 0; x < frame.cols; ++x) {
-      const cv::Vec4b& o = warped.at<cv::Vec4b>(y, x);
-      if (o[3] == 0)
+      const cv::Vec4f& o = warped.at<cv::Vec4f>(y, x);
+      if (o[3] <= 0.0f)
         continue;
       cv::Vec3b& f = frame.at<cv::Vec3b>(y, x);
-      const float a = o[3] / 255.0f;
       for (int ch = 0; ch < 3; ++ch)
-        f[ch] = cv::saturate_cast<uchar>(o[ch] * a + f[ch] * (1.0f - a));
+        f[ch] = cv::saturate_cast<uchar>(255.0f * o[ch] + f[ch] * (1.0f - o[3]));
     }
   }
 }
