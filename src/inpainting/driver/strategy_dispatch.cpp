@@ -20,14 +20,18 @@ namespace {
 
 enum class RequestCheck { kAccepted, kRefused, kImageTooSmall };
 
-// The checks every strategy makes before it decodes the rectangles.
-RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& values) {
+// The checks every strategy makes before it decodes the rectangles. The
+// request entry makes them too, but leaves the progress and too-small
+// messages to the strategies (`announce` false).
+RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& values,
+                          bool announce = true) {
   if (image.data == nullptr || image.empty()) {
     OCR_LOGE(" Inpainting_Process: Error in input of inpainting. Empty data.");
     return RequestCheck::kRefused;
   }
   const int value_count = static_cast<int>(values.size());
-  OCR_LOGI("  Inpainting_Process: rotate_rects.size = %d", value_count);
+  if (announce)
+    OCR_LOGI("  Inpainting_Process: rotate_rects.size = %d", value_count);
   if (values.empty() || values.size() % kValsPerRect != 0) {
     OCR_LOGE(" Inpainting_Process: Error in rotate_recs.size %d", value_count);
     return RequestCheck::kRefused;
@@ -38,7 +42,8 @@ RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& value
   }
   // Too small to work on is not a failed request: the outputs stay as they are.
   if (image.rows < kMinInpaintSize || image.cols < kMinInpaintSize) {
-    OCR_LOGE(" Inpainting_Process: input image size is too small ");
+    if (announce)
+      OCR_LOGE(" Inpainting_Process: input image size is too small ");
     return RequestCheck::kImageTooSmall;
   }
   return RequestCheck::kAccepted;
@@ -61,7 +66,7 @@ int InpaintingRotImg(const cv::Mat& image, const std::vector<double>& values,
                      std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors) {
   // A request that every strategy would refuse is answered here: the smart
   // version reports success whatever its strategies return.
-  if (CheckRequest(image, values) == RequestCheck::kRefused)
+  if (CheckRequest(image, values, false) == RequestCheck::kRefused)
     return -1;
   InpaintingRotImgSmartVersion(image, values, overlays, colors);
   return 0;

@@ -184,7 +184,7 @@ TEST(InpaintingRotImg, RefusesRequestsNoStrategyCanServe) {
     r.overlays = {cv::Mat(3, 3, CV_8UC1)};
     r.status = InpaintingRotImg(c.image, c.values, r.overlays, r.colors);
     EXPECT_EQ(r.status, -1) << c.message;
-    EXPECT_TRUE(capture.Contains(c.message, ocr::log::kError)) << c.message;
+    EXPECT_EQ(capture.Count(c.message, ocr::log::kError), 1) << c.message;
     EXPECT_EQ(r.overlays.size(), 1u) << "outputs touched: " << c.message;
     EXPECT_TRUE(r.colors.empty()) << c.message;
   }
