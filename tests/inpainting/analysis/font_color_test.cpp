@@ -119,6 +119,21 @@ TEST(GetFontColor, ShortPatchKeepsFullHeightAndWeakTextIsEnhanced) {
   EXPECT_LT(color[0], 150.0);
 }
 
+TEST(GetFontColor, EmptyFontMaskFallsBackToTheInpaintingMask) {
+  PatchSpec spec;
+  spec.text_color = {30, 60, 150};
+  const auto patch = ocr_testing::DrawTextPatch(spec);
+  cv::Mat mask, font_mask;
+  int vertical_partition = -1;
+  GetMask(patch.rgb, mask, font_mask, vertical_partition);
+  cv::Scalar color;
+  EXPECT_EQ(
+      GetFontColor(patch.rgb, mask, patch.background, cv::Mat::zeros(mask.size(), CV_8UC1), color),
+      0);
+  for (int c = 0; c < 3; ++c)
+    EXPECT_NEAR(color[c], spec.text_color[c], 12.0) << color;
+}
+
 TEST(DetectTextColor, BlackTextIsKeptAndReportedAsSufficient) {
   const cv::Mat image(4, 4, CV_8UC3, cv::Scalar(5, 5, 5));
   const cv::Mat weights(4, 4, CV_8UC1, cv::Scalar(255));
