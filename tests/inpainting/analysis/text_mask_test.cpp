@@ -81,12 +81,6 @@ TEST(GetMask, TwoWordsSplitAtTheSecondWord) {
   EXPECT_LE(m.vertical_partition, ink[widest + 1].x + 2);
 }
 
-TEST(GetMask, OneWordLeavesNoSplitOnTheTextSide) {
-  const Masks m = RunGetMask(ocr_testing::DrawTextPatch(PatchSpec{}).rgb);
-  // No split at all, or one that the colour measure reads as "all columns".
-  EXPECT_TRUE(m.vertical_partition < 1 || m.vertical_partition >= 160) << m.vertical_partition;
-}
-
 TEST(GetMask, PatchesBelow4x4AreRefusedAndEmptyOnesDoNotCrash) {
   for (const cv::Size size : {cv::Size(3, 20), cv::Size(20, 3), cv::Size(0, 0)}) {
     ocr::log::ScopedCapture capture;
