@@ -82,6 +82,20 @@ TEST(GetBinaryImgNormalized, BelowTwentyOneRowsBothPlausibleKeepsTheMask) {
   EXPECT_EQ(cv::norm(mask, before, cv::NORM_INF), 0);
 }
 
+TEST(GetBinaryImgNormalized, ErodesACopySoARegionIgnoresItsSurroundings) {
+  // White ref inside a black frame: eroded in place, its top row and left
+  // column would darken and break the tie between the two halves below.
+  cv::Mat parent = cv::Mat::zeros(32, 32, CV_8UC1);
+  parent(cv::Rect(1, 1, 30, 30)).setTo(255);
+  const cv::Mat ref = parent(cv::Rect(1, 1, 30, 30));
+  cv::Mat mask = cv::Mat::zeros(30, 30, CV_8UC1);
+  mask.colRange(0, 15).setTo(255);
+  const cv::Mat candidate = 255 - mask;
+  const cv::Mat before = mask.clone();
+  GetBinaryImgNormalized(ref, candidate, mask);
+  EXPECT_EQ(cv::norm(mask, before, cv::NORM_INF), 0);
+}
+
 ocr_testing::SyntheticPatch DarkTextPatch() {
   return ocr_testing::DrawTextPatch(ocr_testing::PatchSpec{});
 }

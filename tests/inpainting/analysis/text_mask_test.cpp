@@ -117,6 +117,29 @@ TEST(GetInpaintingMask, AllWhiteMaskGetsABlackFrame) {
   EXPECT_EQ(cv::countNonZero(mask(cv::Rect(1, 1, 28, 28))), 28 * 28);
 }
 
+TEST(GetInpaintingMask, RegionOfALargerImageGivesTheSameMasksAsACopy) {
+  // The block path hands in regions of the block patch and its edge mask.
+  PatchSpec spec;
+  spec.size = {200, 90};
+  spec.lines = {"Menu", "Carte"};
+  spec.background = Background::kTexture;
+  spec.background_color2 = {6, 6, 6};
+  const auto block = ocr_testing::DrawTextPatch(spec);
+  cv::Mat edges;
+  cv::morphologyEx(block.rgb, edges, cv::MORPH_GRADIENT, cv::Mat::ones(3, 3, CV_8U));
+  cv::cvtColor(edges, edges, cv::COLOR_RGB2GRAY);
+  edges = edges > 40;
+  const cv::Rect region(20, 8, 150, 40);
+  Masks view, copy;
+  GetInpaintingMask(block.rgb(region), edges(region), view.mask, view.font_mask,
+                    view.vertical_partition);
+  GetInpaintingMask(block.rgb(region).clone(), edges(region).clone(), copy.mask, copy.font_mask,
+                    copy.vertical_partition);
+  EXPECT_EQ(cv::norm(view.mask, copy.mask, cv::NORM_INF), 0);
+  EXPECT_EQ(cv::norm(view.font_mask, copy.font_mask, cv::NORM_INF), 0);
+  EXPECT_EQ(view.vertical_partition, copy.vertical_partition);
+}
+
 TEST(PartialImgDilation, KeepsTwoPixelBandsOutOfTheDilation) {
   for (const int rows : {20, 21}) {
     cv::Mat mask = cv::Mat::zeros(rows, 30, CV_8UC1);
