@@ -74,6 +74,7 @@ struct Stats {
 struct GroupStats {
   Stats text_in_mask, bg_in_mask, far_bg_in_mask, text_in_font, bg_in_font;
   Stats de_ideal, de_telea, channel_telea;
+  int inverted = 0;  // font mask holding background rather than text
 };
 
 const char* BackgroundName(Background b) {
@@ -96,10 +97,11 @@ void PrintGroups(const std::map<std::string, GroupStats>& groups) {
               "mean", "mean", "mean", "mean", "median (p90)", "median (p90)", "median");
   for (const auto& [name, g] : groups) {
     std::printf(
-        "%-26s %4zu | %.4f (%.3f) %7.4f %7.4f | %7.4f %7.4f | %6.2f (%6.2f) %6.2f (%6.2f) %7.1f\n",
+        "%-26s %4zu | %.4f (%.3f) %7.4f %7.4f | %7.4f %7.4f %4d | %6.2f (%6.2f) %6.2f (%6.2f) "
+        "%7.1f\n",
         name.c_str(), g.text_in_mask.values.size(), g.text_in_mask.Mean(), g.text_in_mask.Min(),
         g.bg_in_mask.Mean(), g.far_bg_in_mask.Mean(), g.text_in_font.Mean(), g.bg_in_font.Mean(),
-        g.de_ideal.Quantile(0.5), g.de_ideal.Quantile(0.9), g.de_telea.Quantile(0.5),
+        g.inverted, g.de_ideal.Quantile(0.5), g.de_ideal.Quantile(0.9), g.de_telea.Quantile(0.5),
         g.de_telea.Quantile(0.9), g.channel_telea.Quantile(0.5));
   }
 }
@@ -130,6 +132,7 @@ void MeasureLibrary(const std::vector<PatchSpec>& specs) {
       g.bg_in_mask.Add(CoveredShare(mask, patch.BackgroundPixels()));
       g.far_bg_in_mask.Add(CoveredShare(mask, FarBackground(patch)));
       g.text_in_font.Add(CoveredShare(font_mask, patch.TextPixels()));
+      g.inverted += CoveredShare(font_mask, patch.TextPixels()) < 0.5 ? 1 : 0;
       g.bg_in_font.Add(CoveredShare(font_mask, patch.BackgroundPixels()));
       g.de_ideal.Add(DeltaE(ideal, spec.text_color));
       g.de_telea.Add(DeltaE(telea, spec.text_color));
@@ -272,6 +275,7 @@ int main(int argc, char** argv) {
   const std::vector<PatchSpec> sparse = SparseSpecs(48, seed + 1);
   std::printf("\n48 sparse patches (a lone mark or short word in a large box):\n");
   CompareSparseRule(sparse);
+  std::printf("\nThe %d varied patches above:\n", count);
   CompareSparseRule(specs);
   return 0;
 }
