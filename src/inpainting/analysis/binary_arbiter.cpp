@@ -58,8 +58,10 @@ void GetBinaryImgNormalized(const cv::Mat& ref, const cv::Mat& candidate, cv::Ma
   // a tie keeps the current mask.
   if (same_matrix || ref.rows < kMinOutlineCompareSize || ref.cols < kMinOutlineCompareSize)
     return;
-  cv::Mat eroded_ref;
-  cv::erode(ref, eroded_ref, Ellipse2x2Kernel(), cv::Point(-1, -1), 1, cv::BORDER_CONSTANT,
+  // Eroded as a copy: when ref is a region of a larger mask (one part of a
+  // split patch), the pixels around the region must not take part.
+  cv::Mat eroded_ref = ref.clone();
+  cv::erode(eroded_ref, eroded_ref, Ellipse2x2Kernel(), cv::Point(-1, -1), 1, cv::BORDER_CONSTANT,
             cv::morphologyDefaultBorderValue());
   const int candidate_count = CountDifferences(candidate, eroded_ref);
   const int mask_count = CountDifferences(mask, eroded_ref);

