@@ -3,10 +3,10 @@
 #include <array>
 #include <string>
 
-#include <opencv2/core.hpp>
-#include <opencv2/imgproc.hpp>
 #include <tbb/blocked_range.h>
 #include <tbb/parallel_for.h>
+#include <opencv2/core.hpp>
+#include <opencv2/imgproc.hpp>
 
 #include "common/log.h"
 #include "common/nanotime.h"
@@ -26,11 +26,14 @@ bool IsMeasurable(const cv::Mat* frame) {
     OCR_LOGE("ImgResEstimate: empty image");
     return false;
   }
+  if (frame->dims != 2) {
+    OCR_LOGE("ImgResEstimate: unsupported image with %d dimensions (need 2)", frame->dims);
+    return false;
+  }
   const int type = frame->type();
-  if (frame->dims != 2 || (type != CV_8UC4 && type != CV_8UC3 && type != CV_8UC1)) {
-    OCR_LOGE("ImgResEstimate: unsupported image type %s with %d dimensions (need 8-bit RGBA, RGB "
-             "or grey, 2 dimensions)",
-             cv::typeToString(type).c_str(), frame->dims);
+  if (type != CV_8UC4 && type != CV_8UC3 && type != CV_8UC1) {
+    OCR_LOGE("ImgResEstimate: unsupported image type %s (need 8-bit RGBA, RGB or grey)",
+             cv::typeToString(type).c_str());
     return false;
   }
   if (ChooseWindowSide(frame->size()) == 0) {
@@ -70,19 +73,21 @@ double EstimateResolution(const cv::Mat* frame) {
   const SpectrumPlan plan = MakeSpectrumPlan(side);
 
   std::array<double, kWindowCount> cutoffs{};
-  tbb::parallel_for(tbb::blocked_range<int>(0, kWindowCount), [&](const tbb::blocked_range<int>& r) {
-    for (int i = r.begin(); i != r.end(); ++i)
-      cutoffs[i] = WindowCutoff(RadialPowerProfile(GreyWindow(*frame, windows[i]), plan));
-  });
+  tbb::parallel_for(
+      tbb::blocked_range<int>(0, kWindowCount), [&](const tbb::blocked_range<int>& r) {
+        for (int i = r.begin(); i != r.end(); ++i)
+          cutoffs[i] = WindowCutoff(RadialPowerProfile(GreyWindow(*frame, windows[i]), plan));
+      });
   const double estimate = CombineWindowCutoffs(cutoffs);
 
   int with_detail = 0;
   for (double cutoff : cutoffs)
     with_detail += cutoff > kNoDetail ? 1 : 0;
-  OCR_LOGD("ImgResEstimate: %dx%d, %d of %d windows of %d px with detail, estimate %.3f of Nyquist, "
-           "%.2f ms",
-           frame->cols, frame->rows, with_detail, kWindowCount, side, estimate,
-           (get_nanotime() - start) / 1e6);
+  OCR_LOGD(
+      "ImgResEstimate: %dx%d, %d of %d windows of %d px with detail, estimate %.3f of Nyquist, "
+      "%.2f ms",
+      frame->cols, frame->rows, with_detail, kWindowCount, side, estimate,
+      (get_nanotime() - start) / 1e6);
   return estimate;
 }
 
