@@ -17,8 +17,8 @@
 //             (0, 1]      1 is detail up to the pixel grid; a frame enlarged
 //                         by a factor s from a sharp one reads about 1/s
 //                         (about 0.8/s after bilinear enlargement, which also
-//                         softens); a Gaussian defocus of sigma px about
-//                         0.47/sigma.
+//                         softens); a Gaussian defocus of sigma >= 2 px
+//                         about 0.5/sigma.
 //                         Multiplied by the width (height) it gives the
 //                         effective pixels across (down). The smallest
 //                         value is the bottom of the coarse band: 0.03 for

@@ -25,20 +25,21 @@ public final class ResolutionJNI {
    * Estimates the effective resolution of one frame.
    *
    * <p>The engine looks at nine windows on a 3×3 grid, finds in each the highest spatial
-   * frequency that still holds detail (where its energy spectrum falls to the noise floor or far
-   * below the level of natural detail) and returns the median over the windows that hold any
-   * detail, so that a window of blank wall or sky does not decide. Takes a few milliseconds for a
-   * 1080p frame and may be called from any thread; the frame is only read.
+   * frequency that still holds detail (where its energy spectrum falls to the noise floor or, once
+   * whitened, far below its peak) and returns the median over the windows that hold any
+   * detail, so that a window of blank wall or sky does not decide. The work is at most nine 256×256
+   * transforms whatever the frame size; the call may come from any thread and only reads the
+   * frame.
    *
    * @param matAddr {@code getNativeObjAddr()} of an {@code org.opencv.core.Mat} of type {@code
    *     CV_8UC4} (R, G, B, A), {@code CV_8UC3} (R, G, B) or {@code CV_8UC1} (grey), at least 96
    *     pixels on its shorter side
-   * @return the highest frequency with detail as a fraction of the frame's Nyquist limit (half a
-   *     cycle per pixel), in (0, 1]: 1 for detail up to the pixel grid, about 1/s for a sharp
-   *     image enlarged s times, about 0.5/sigma for a Gaussian defocus of sigma pixels. Times the
-   *     frame's width it gives the effective pixels across. {@link #NO_DETAIL} for a frame without
-   *     detail, {@link #NOT_MEASURED} for a null address, an empty or smaller frame, or another
-   *     type.
+   * @return the highest frequency that holds detail, as a fraction of the frame's Nyquist limit
+   *     (half a cycle per pixel), in (0, 1]. 1 is detail up to the pixel grid; a sharp image
+   *     enlarged s times reads about 1/s; a Gaussian defocus of sigma pixels (2 or more) about
+   *     0.5/sigma. Times the frame's width it gives the effective pixels across. {@link
+   *     #NO_DETAIL} for a frame without detail; {@link #NOT_MEASURED} for a null address, an empty
+   *     or smaller frame, or another type.
    */
   public static native double ImgResEstimate(long matAddr);
 }

@@ -88,17 +88,6 @@ class ResolutionJNITest {
     assertTrue(log.messages('E').isEmpty(), log.lines().toString());
   }
 
-  @Test
-  void eachCallLogsOneSummaryLineAtDebugLevel() {
-    Mat frame = toRgb(texturedFrame(1920, 1080, 3));
-    ResolutionJNI.ImgResEstimate(frame.getNativeObjAddr());
-    List<String> debug = log.messages('D');
-    assertEquals(1, debug.size(), log.lines().toString());
-    assertTrue(
-        debug.get(0).startsWith("ImgResEstimate: 1920x1080, 9 of 9 windows of 256 px with detail"),
-        debug.get(0));
-  }
-
   private void assertNotMeasured(long address, String message) {
     log.mark();
     assertEquals(ResolutionJNI.NOT_MEASURED, ResolutionJNI.ImgResEstimate(address), message);
