@@ -51,7 +51,7 @@ class Renderer {
 // Linux an offscreen framebuffer of the window's size whose frame is copied
 // into the desktop window at presentation. Holds a reference to the window
 // while it lives. A null window throws Vexel::Exception. The anti-aliasing
-// samples select a multisampled surface where the platform offers one.
+// samples are accepted for compatibility; surfaces are not multisampled.
 class AndroidSurfaceRenderer : public Renderer {
  public:
   AndroidSurfaceRenderer(Kit& kit, ANativeWindow* window, AntiAliasingSamples samples);
