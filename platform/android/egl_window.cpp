@@ -52,7 +52,8 @@ class AndroidDevice : public GlDevice {
     if (context_ == EGL_NO_CONTEXT)
       throw std::runtime_error(EglFailure("eglCreateContext"));
     const char* extensions = eglQueryString(display_, EGL_EXTENSIONS);
-    if (extensions == nullptr || std::strstr(extensions, "EGL_KHR_surfaceless_context") == nullptr) {
+    if (extensions == nullptr ||
+        std::strstr(extensions, "EGL_KHR_surfaceless_context") == nullptr) {
       const EGLint pbuffer_attributes[] = {EGL_WIDTH, 1, EGL_HEIGHT, 1, EGL_NONE};
       pbuffer_ = eglCreatePbufferSurface(display_, config_, pbuffer_attributes);
     }

@@ -103,8 +103,8 @@ DESKTOP_JNI jlong JNICALL Java_org_vexel_desktop_OffscreenSurface_nativeFrameCou
   return static_cast<jlong>(platform::desktop::PresentedFrameCount(Window(window)));
 }
 
-DESKTOP_JNI jlong JNICALL Java_org_vexel_desktop_DirectoryAssetManager_nativeCreate(
-    JNIEnv* env, jclass, jstring directory) {
+DESKTOP_JNI jlong JNICALL
+Java_org_vexel_desktop_DirectoryAssetManager_nativeCreate(JNIEnv* env, jclass, jstring directory) {
   return reinterpret_cast<jlong>(
       platform::desktop::CreateDirectoryAssetManager(ToString(env, directory)));
 }

@@ -11,8 +11,8 @@ Matrix4 CameraImpl::Projection(float viewport_aspect) const {
     return Matrix4::Orthographic(-width / 2, width / 2, -height / 2, height / 2, near_clip,
                                  far_clip);
   }
-  return Matrix4::Perspective(field_of_view, automatic_aspect ? viewport_aspect : aspect,
-                              near_clip, far_clip);
+  return Matrix4::Perspective(field_of_view, automatic_aspect ? viewport_aspect : aspect, near_clip,
+                              far_clip);
 }
 
 }  // namespace internal

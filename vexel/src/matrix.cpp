@@ -65,8 +65,7 @@ Matrix4 Matrix4::AffineInverse() const {
   r.at(2, 1) = (b * g - a * h) * k;
   r.at(2, 2) = (a * e - b * d) * k;
   for (int row = 0; row < 3; ++row) {
-    r.at(row, 3) =
-        -(r.at(row, 0) * at(0, 3) + r.at(row, 1) * at(1, 3) + r.at(row, 2) * at(2, 3));
+    r.at(row, 3) = -(r.at(row, 0) * at(0, 3) + r.at(row, 1) * at(1, 3) + r.at(row, 2) * at(2, 3));
   }
   return r;
 }

@@ -20,8 +20,7 @@ struct Matrix4 {
   // Maps the box left..right, bottom..top, -near..-far onto clip space.
   static Matrix4 Orthographic(float left, float right, float bottom, float top, float near_clip,
                               float far_clip);
-  static Matrix4 Perspective(float vertical_degrees, float aspect, float near_clip,
-                             float far_clip);
+  static Matrix4 Perspective(float vertical_degrees, float aspect, float near_clip, float far_clip);
 
   // Inverse of an affine matrix (no projective row).
   Matrix4 AffineInverse() const;

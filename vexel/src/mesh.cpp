@@ -113,11 +113,11 @@ void Mesh::end() {
     throw Exception(what + std::to_string(m.positions.size()) + " positions for " +
                     std::to_string(n) + " vertices");
   if (!m.texture_coords.empty() && m.texture_coords.size() != n)
-    throw Exception(what + std::to_string(m.texture_coords.size()) +
-                    " texture coordinates for " + std::to_string(n) + " vertices");
-  if (!m.normals.empty() && m.normals.size() != n)
-    throw Exception(what + std::to_string(m.normals.size()) + " normals for " +
+    throw Exception(what + std::to_string(m.texture_coords.size()) + " texture coordinates for " +
                     std::to_string(n) + " vertices");
+  if (!m.normals.empty() && m.normals.size() != n)
+    throw Exception(what + std::to_string(m.normals.size()) + " normals for " + std::to_string(n) +
+                    " vertices");
   if (m.indices.size() != m.expected_indices)
     throw Exception(what + std::to_string(m.indices.size()) + " indices where " +
                     std::to_string(m.expected_indices) + " were announced");

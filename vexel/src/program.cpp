@@ -51,8 +51,8 @@ Program::Program(std::shared_ptr<Gpu> gpu, const std::string& vertex_name,
 
 std::shared_ptr<GlObject> Program::Compile(GLenum type, const std::string& name,
                                            const std::string& source) {
-  auto shader = std::make_shared<GlObject>(program_->gpu().shared_from_this(), GlObject::kShader,
-                                           type);
+  auto shader =
+      std::make_shared<GlObject>(program_->gpu().shared_from_this(), GlObject::kShader, type);
   const char* text = source.c_str();
   glShaderSource(shader->id(), 1, &text, nullptr);
   glCompileShader(shader->id());
@@ -76,8 +76,8 @@ void Program::Introspect() {
   for (GLint i = 0; i < count; ++i) {
     GLint size = 0;
     GLenum type = 0;
-    glGetActiveAttrib(id, static_cast<GLuint>(i), static_cast<GLsizei>(name.size()), nullptr,
-                      &size, &type, name.data());
+    glGetActiveAttrib(id, static_cast<GLuint>(i), static_cast<GLsizei>(name.size()), nullptr, &size,
+                      &type, name.data());
     const std::string attribute(name.data());
     const GLint location = glGetAttribLocation(id, name.data());
     attributes_[attribute] = location;

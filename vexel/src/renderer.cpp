@@ -48,9 +48,9 @@ Renderer::Impl::Impl(std::shared_ptr<Kit::Impl> owner, ANativeWindow* window)
     throw Exception(std::string("Vexel: cannot draw into the window: ") + error.what());
   }
   kit->renderers.push_back(this);
-  kit->log.Write(internal::KitLog::kInfo,
-                 "Vexel: renderer " + std::to_string(surface->Width()) + "x" +
-                     std::to_string(surface->Height()) + " on " + gpu->device()->Description());
+  kit->log.Write(internal::KitLog::kInfo, "Vexel: renderer " + std::to_string(surface->Width()) +
+                                              "x" + std::to_string(surface->Height()) + " on " +
+                                              gpu->device()->Description());
 }
 
 Renderer::Impl::~Impl() {
@@ -97,8 +97,8 @@ Renderer::~Renderer() = default;
 
 void Renderer::setScene(Scene* scene) {
   impl_->scene = scene;
-  impl_->scene_alive = scene != nullptr ? internal::Access::SharedImplOf(*scene)
-                                        : std::weak_ptr<Scene::Impl>();
+  impl_->scene_alive =
+      scene != nullptr ? internal::Access::SharedImplOf(*scene) : std::weak_ptr<Scene::Impl>();
 }
 
 Scene* Renderer::getScene() const {

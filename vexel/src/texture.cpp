@@ -106,8 +106,8 @@ const std::string& Texture::getName() const {
 void Texture::setImage(const unsigned char* data, int width, int height, PixelFormat format) {
   Impl& t = *impl_;
   if (width < 0 || height < 0) {
-    throw Exception("Vexel: texture \"" + t.name + "\": image size " + std::to_string(width) +
-                    "x" + std::to_string(height) + " is negative");
+    throw Exception("Vexel: texture \"" + t.name + "\": image size " + std::to_string(width) + "x" +
+                    std::to_string(height) + " is negative");
   }
   const UploadFormat upload = FormatOf(format);
   std::vector<unsigned char> swizzled;
