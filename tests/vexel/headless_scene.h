@@ -70,7 +70,8 @@ inline std::string Show(const Rgba& p) {
         << ", expected " << ::vexel_test::Show(expected_pixel);                           \
   } while (0)
 
-// A kit drawing headless into an offscreen window of width x height pixels,
+// A kit drawing headless into an offscreen window of width x height pixels
+// (64 x 48 unless a test fixture asks for another size),
 // through an orthographic camera whose window is the same size in scene
 // units: scene (x, y) lands on pixel column x + width/2, row height/2 - y.
 // Content goes at z = -10, in front of the camera.
@@ -80,8 +81,11 @@ class HeadlessScene : public ::testing::Test {
   static constexpr int kHeight = 48;
   static constexpr float kDepth = -10.0f;
 
+  explicit HeadlessScene(int width = kWidth, int height = kHeight)
+      : width_(width), height_(height) {}
+
   void SetUp() override {
-    window_ = platform::desktop::CreateOffscreenWindow(kWidth, kHeight);
+    window_ = platform::desktop::CreateOffscreenWindow(width_, height_);
     kit_ = std::make_unique<Vexel::Kit>(nullptr, "");
     renderer_ = std::make_unique<Vexel::AndroidSurfaceRenderer>(
         *kit_, window_, Vexel::Renderer::ANTI_ALIASING_NONE);
@@ -90,7 +94,7 @@ class HeadlessScene : public ::testing::Test {
     camera_ = std::make_unique<Vexel::Camera>();
     camera_->setParent(scene_->getRootNode());
     camera_->setProjectionMode(Vexel::PROJECTION_ORTHOGRAPHIC);
-    camera_->setOrthographicWindowSize(kWidth, kHeight);
+    camera_->setOrthographicWindowSize(static_cast<float>(width_), static_cast<float>(height_));
     camera_->setAutomaticAspectRatio(false);
     camera_->setNearClipDistance(1.0f);
     camera_->setFarClipDistance(300.0f);
@@ -107,7 +111,7 @@ class HeadlessScene : public ::testing::Test {
 
   Frame Draw() {
     kit_->drawAll();
-    return Frame{kWidth, kHeight, platform::desktop::ReadFrame(window_)};
+    return Frame{width_, height_, platform::desktop::ReadFrame(window_)};
   }
 
   // The unit quad centred on its node, v running down so that the first
@@ -152,6 +156,8 @@ class HeadlessScene : public ::testing::Test {
     return material;
   }
 
+  const int width_;
+  const int height_;
   ANativeWindow* window_ = nullptr;
   std::unique_ptr<Vexel::Kit> kit_;
   std::unique_ptr<Vexel::AndroidSurfaceRenderer> renderer_;
