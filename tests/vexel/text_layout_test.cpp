@@ -189,11 +189,11 @@ TEST(DistanceFieldTest, EncodesSignedPixelDistancesAroundTheOutline) {
   ASSERT_EQ(field.height, 26);
   auto at = [&](int x, int y) { return static_cast<int>(field.texels[y * 26 + x]); };
   const int row = 13;
-  EXPECT_NEAR(at(8, row), 128, 1);        // the half-covered column holds the outline
-  EXPECT_NEAR(at(4, row), 128 - 64, 1);   // four pixels out
-  EXPECT_NEAR(at(12, row), 128 + 64, 1);  // four pixels in
-  EXPECT_EQ(at(0, row), 0);               // the spread's far end, clamped
-  EXPECT_EQ(at(13, 13), 255);             // deep inside, clamped
+  EXPECT_NEAR(at(8, row), 128, 1);           // the half-covered column holds the outline
+  EXPECT_NEAR(at(4, row), 128 - 64, 1);      // four pixels out
+  EXPECT_NEAR(at(12, row), 128 + 64, 1);     // four pixels in
+  EXPECT_EQ(at(0, row), 0);                  // the spread's far end, clamped
+  EXPECT_NEAR(at(13, 13), 128 + 5 * 16, 1);  // five pixels from the right edge
   // Every row through the square rises monotonically towards the middle.
   for (int x = 1; x <= 13; ++x)
     EXPECT_GE(at(x, row), at(x - 1, row));
