@@ -146,7 +146,7 @@ void BM_Blur(benchmark::State& state) {
   BENCHMARK(fn)                       \
       ->Unit(benchmark::kMillisecond) \
       ->UseRealTime()                 \
-      ->Repetitions(5)                \
+      ->Repetitions(9)                \
       ->ReportAggregatesOnly(true)
 
 TRACKING_BENCHMARK(BM_StartTracker);
