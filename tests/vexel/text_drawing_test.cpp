@@ -1,0 +1,183 @@
+#include <algorithm>
+#include <cmath>
+
+#include "headless_scene.h"
+
+namespace vexel_test {
+namespace {
+
+using Vexel::Font;
+using Vexel::Text;
+
+// Pixels lit by drawing over the black background.
+struct Ink {
+  int count = 0;
+  int left = 1 << 20, top = 1 << 20, right = -1, bottom = -1;  // inclusive
+  Rgba brightest{0, 0, 0, 0};
+};
+
+Ink FindInk(const Frame& frame) {
+  Ink ink;
+  int best = -1;
+  for (int y = 0; y < frame.height; ++y) {
+    for (int x = 0; x < frame.width; ++x) {
+      const Rgba p = frame.At(x, y);
+      const int sum = p[0] + p[1] + p[2];
+      if (sum <= 12)
+        continue;
+      ++ink.count;
+      ink.left = std::min(ink.left, x);
+      ink.right = std::max(ink.right, x);
+      ink.top = std::min(ink.top, y);
+      ink.bottom = std::max(ink.bottom, y);
+      if (sum > best) {
+        best = sum;
+        ink.brightest = p;
+      }
+    }
+  }
+  return ink;
+}
+
+class TextDrawing : public HeadlessScene {
+ protected:
+  TextDrawing() : HeadlessScene(200, 120) {}
+
+  // A text node `pixels_per_em` pixels to the em, its origin at scene (x, y).
+  std::unique_ptr<Text> MakeText(const Font& font, const std::string& content, float pixels_per_em,
+                                 float x, float y) {
+    auto text = std::make_unique<Text>();
+    text->setFont(font);
+    text->setText(content);
+    text->setColor(Vexel::Color(1.0f, 0.5f, 0.0f, 1.0f));
+    text->initialize();
+    text->setPosition(x, y, kDepth);
+    text->setScale(pixels_per_em, pixels_per_em, 1);
+    text->setParent(scene_->getRootNode());
+    return text;
+  }
+
+  // Pixel columns and rows covered by a box in the text's units.
+  struct PixelBox {
+    float left, top, right, bottom;
+  };
+  PixelBox ToPixels(const Text& text, const Vexel::Rect& box) const {
+    const Vexel::Vector3 at = text.getPosition();
+    const float s = text.getScale().x;
+    return {at.x + box.left * s + width_ / 2.0f, height_ / 2.0f - (at.y + box.top * s),
+            at.x + box.right * s + width_ / 2.0f, height_ / 2.0f - (at.y + box.bottom * s)};
+  }
+};
+
+TEST_F(TextDrawing, LatinTextDrawsInsideItsBoundingBoxInItsColour) {
+  Font font("DejaVuSans.ttf", Font::FILE_TYPE_SYSTEM, true);
+  auto text = MakeText(font, "HIH", 40, -60, 20);
+  const Vexel::Rect box = text->getBoundingBox();
+  EXPECT_EQ(text->getLineCount(), 1u);
+  ASSERT_FALSE(box.isEmpty());
+
+  const Ink ink = FindInk(Draw());
+  ASSERT_GT(ink.count, 300);
+  const PixelBox expected = ToPixels(*text, box);
+  EXPECT_GE(ink.left, std::floor(expected.left) - 1);
+  EXPECT_LE(ink.right, std::ceil(expected.right) + 1);
+  EXPECT_GE(ink.top, std::floor(expected.top) - 1);
+  EXPECT_LE(ink.bottom, std::ceil(expected.bottom) + 1);
+  // Stems 40 pixels to the em are several pixels wide: fully covered pixels
+  // show the colour itself.
+  EXPECT_TRUE(Near(ink.brightest, {255, 128, 0, 255}, 4)) << Show(ink.brightest);
+}
+
+TEST_F(TextDrawing, GlyphEdgesStaySharpWhenTheNodeMagnifiesTheText) {
+  Font font("DejaVuSans.ttf", Font::FILE_TYPE_SYSTEM, true);
+  // 600 pixels to the em: the "I" stem is about 60 pixels wide, far larger
+  // than the glyph's raster.
+  auto text = MakeText(font, "I", 600, -100, 60 + 120);
+  const Frame frame = Draw();
+  const Ink ink = FindInk(frame);
+  ASSERT_GT(ink.count, 1000);
+  // Across one row through the stem: a run of full coverage with at most a
+  // pixel or two of partial coverage on each side.
+  const int row = frame.height / 2;
+  int partial = 0;
+  int full = 0;
+  for (int x = 0; x < frame.width; ++x) {
+    const int red = frame.At(x, row)[0];
+    if (red >= 250)
+      ++full;
+    else if (red > 5)
+      ++partial;
+  }
+  EXPECT_GT(full, 40);
+  EXPECT_LE(partial, 4);
+}
+
+TEST_F(TextDrawing, CjkTextFromAPlatformCollectionDrawsAndItsReferenceCharacterSizesTheLine) {
+  Font font("NotoSansCJK-Regular.ttc", Font::FILE_TYPE_SYSTEM, true);
+  auto text = MakeText(font, "中文字幕", 30, -60, 20);
+  const float default_height = text->getBoundingBox().height();
+  EXPECT_GT(default_height, 1.4f);  // the collection's tall ascender and descender
+
+  font.setReferenceCharacter(0xFF41);
+  EXPECT_EQ(font.getReferenceCharacter(), 0xFF41u);
+  const Vexel::Rect box = text->getBoundingBox();
+  EXPECT_NEAR(box.height(), 1.0f, 0.02f);  // one em: the fullwidth character's box
+  EXPECT_NEAR(box.width(), 4.0f, 0.02f);   // four fullwidth advances
+
+  const Ink ink = FindInk(Draw());
+  EXPECT_GT(ink.count, 400);
+  const PixelBox expected = ToPixels(*text, box);
+  EXPECT_GE(ink.left, std::floor(expected.left) - 1);
+  EXPECT_LE(ink.right, std::ceil(expected.right) + 1);
+  EXPECT_GE(ink.top, std::floor(expected.top) - 1);
+  EXPECT_LE(ink.bottom, std::ceil(expected.bottom) + 1);
+}
+
+TEST_F(TextDrawing, ArabicTextDrawsRightToLeftStartingAtTheRight) {
+  Font font("NotoSansArabic-Regular.ttf", Font::FILE_TYPE_SYSTEM, true);
+  // Right-aligned at x = 60: a right-to-left paragraph puts its first word
+  // at the right end, exactly where the word drawn alone lies.
+  auto text = MakeText(font, "بيت", 30, 60, 10);
+  text->setHorizontalAlignment(Text::ALIGN_RIGHT);
+  const Frame word = Draw();
+  const Ink alone = FindInk(word);
+  ASSERT_GT(alone.count, 50);
+
+  text->setText("بيت كبير جدا");
+  const Frame sentence = Draw();
+  const Ink whole = FindInk(sentence);
+  EXPECT_LT(whole.left, alone.left - 30);  // the other words go to the left
+  int differing = 0;
+  for (int y = 0; y < word.height; ++y) {
+    for (int x = alone.left; x <= alone.right; ++x)
+      differing += Near(word.At(x, y), sentence.At(x, y), 8) ? 0 : 1;
+  }
+  EXPECT_EQ(differing, 0);
+}
+
+TEST_F(TextDrawing, DestroyingTheFontLeavesItsTextsDrawing) {
+  auto font = std::make_unique<Font>("DejaVuSans.ttf", Font::FILE_TYPE_SYSTEM, true);
+  auto text = MakeText(*font, "Kept", 30, -50, 10);
+  font.reset();
+  EXPECT_GT(FindInk(Draw()).count, 100);
+  text->setText("Changed after");
+  EXPECT_GT(FindInk(Draw()).count, 100);
+}
+
+TEST_F(TextDrawing, HardEdgedFontsDrawWithoutPartialCoverage) {
+  Font font("DejaVuSans.ttf", Font::FILE_TYPE_SYSTEM, false);
+  auto text = MakeText(font, "HIH", 40, -60, 20);
+  const Frame frame = Draw();
+  int partial = 0;
+  for (int y = 0; y < frame.height; ++y) {
+    for (int x = 0; x < frame.width; ++x) {
+      const int red = frame.At(x, y)[0];
+      partial += red > 5 && red < 250 ? 1 : 0;
+    }
+  }
+  EXPECT_LT(partial, 10);
+  EXPECT_GT(FindInk(frame).count, 300);
+}
+
+}  // namespace
+}  // namespace vexel_test

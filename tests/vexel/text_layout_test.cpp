@@ -1,0 +1,203 @@
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+#include "distance_field.h"
+#include "font_face.h"
+#include "text_layout.h"
+#include "unicode_text.h"
+
+namespace Vexel::internal {
+namespace {
+
+std::shared_ptr<FontFace> Face(const char* file) {
+  return FontFace::Load(file, Font::FILE_TYPE_SYSTEM, nullptr);
+}
+
+std::uint32_t GlyphOf(const FontFace& face, char32_t c) {
+  hb_codepoint_t glyph = 0;
+  hb_font_get_nominal_glyph(face.hb_font(), c, &glyph);
+  return glyph;
+}
+
+// The x of the first placed glyph for this character.
+float XOf(const TextLayout& layout, const FontFace& face, char32_t c) {
+  const std::uint32_t glyph = GlyphOf(face, c);
+  for (const PlacedGlyph& placed : layout.glyphs) {
+    if (placed.glyph == glyph)
+      return placed.x;
+  }
+  ADD_FAILURE() << "no glyph for U+" << std::hex << static_cast<std::uint32_t>(c);
+  return 0.0f;
+}
+
+class TextLayoutTest : public ::testing::Test {
+ protected:
+  TextLayout LayOut(const std::u32string& text, float width = 0.0f, float extra = 0.0f,
+                    Text::HorizontalAlignment alignment = Text::ALIGN_LEFT,
+                    const FontFace* face = nullptr) {
+    LayoutParams params;
+    params.container = Rect(0.0f, 0.0f, width, -10.0f);
+    params.alignment = alignment;
+    params.extra_spacing = extra;
+    const FontFace& used = face != nullptr ? *face : *latin_;
+    params.line = used.DefaultLineMetrics();
+    return LayOutText(text, used, params);
+  }
+
+  std::shared_ptr<FontFace> latin_ = Face("DejaVuSans.ttf");
+};
+
+TEST(UnicodeText, InvalidUtf8BecomesReplacementCharacters) {
+  EXPECT_EQ(DecodeUtf8("a\xC3\xA9z"), U"a\u00E9z");
+  EXPECT_EQ(DecodeUtf8("\xF0\x9F\x98\x80"), U"\U0001F600");
+  EXPECT_EQ(DecodeUtf8("a\xFFz"), U"a\uFFFDz");        // never a lead byte
+  EXPECT_EQ(DecodeUtf8("\xC0\xAF"), U"\uFFFD\uFFFD");  // overlong
+  EXPECT_EQ(DecodeUtf8("\xED\xA0\x80"), U"\uFFFD");    // a surrogate
+  EXPECT_EQ(DecodeUtf8("ab\xE4\xB8"), U"ab\uFFFD");    // cut short
+  EXPECT_EQ(EncodeUtf8(U"a\u00E9\u4E2D\U0001F600"), "a\xC3\xA9\xE4\xB8\xAD\xF0\x9F\x98\x80");
+}
+
+TEST(UnicodeText, NormalizingComposesFoldsSpaceAndDropsControls) {
+  EXPECT_EQ(NormalizeForDisplay(U"  e\u0301\t\tx\r\ny\u3000z  "), U"\u00E9 x y z");
+  EXPECT_EQ(NormalizeForDisplay(U"a\u0007b\u001Fc\u0085"), U"abc");
+  // Marks with no precomposed form stay as they are; joiners stay.
+  EXPECT_EQ(NormalizeForDisplay(U"q\u0308\u200Dy"), U"q\u0308\u200Dy");
+  EXPECT_EQ(NormalizeForDisplay(U" \n\t "), U"");
+}
+
+TEST_F(TextLayoutTest, EmptyTextHasNoLinesAndNoBounds) {
+  const TextLayout layout = LayOut(U"");
+  EXPECT_EQ(layout.line_count, 0u);
+  EXPECT_TRUE(layout.glyphs.empty());
+  EXPECT_EQ(layout.bounds, Rect());
+}
+
+TEST_F(TextLayoutTest, LineBoxesStackDownFromTheContainerTop) {
+  const LineMetrics line = latin_->DefaultLineMetrics();
+  const TextLayout layout = LayOut(U"ab\ncd\r\nef");
+  EXPECT_EQ(layout.line_count, 3u);
+  EXPECT_FLOAT_EQ(layout.bounds.top, 0.0f);
+  EXPECT_FLOAT_EQ(layout.bounds.bottom, -3.0f * line.height());
+  EXPECT_FLOAT_EQ(layout.glyphs[0].y, -line.ascent);
+  EXPECT_FLOAT_EQ(layout.glyphs[2].y, -line.ascent - line.height());
+}
+
+TEST_F(TextLayoutTest, ExtraSpaceGoesBetweenCharactersAndTrailingSpacesTakeNoRoom) {
+  const float plain = LayOut(U"abc").bounds.width();
+  EXPECT_NEAR(LayOut(U"abc", 0.0f, 0.25f).bounds.width(), plain + 0.5f, 1e-4f);
+  EXPECT_NEAR(LayOut(U"abc   ").bounds.width(), plain, 1e-4f);
+  // A combining mark is part of its base's character: no space before it.
+  const float composed = LayOut(U"\u00E9a", 0.0f, 0.25f).bounds.width();
+  EXPECT_NEAR(LayOut(U"e\u0301a", 0.0f, 0.25f).bounds.width(), composed, 0.02f);
+}
+
+TEST_F(TextLayoutTest, LinesBreakAtSpacesToFitTheContainerButNeverInsideAWord) {
+  const float three_words = LayOut(U"one two three").bounds.width();
+  const TextLayout wrapped = LayOut(U"one two three four", three_words + 0.01f);
+  EXPECT_EQ(wrapped.line_count, 2u);
+  EXPECT_NEAR(wrapped.bounds.width(), three_words, 1e-4f);
+  EXPECT_EQ(LayOut(U"Supercalifragilistic", 1.0f).line_count, 1u);  // overflows
+  EXPECT_EQ(LayOut(U"one two three four", 0.0f).line_count, 1u);    // no width: no wrapping
+}
+
+TEST_F(TextLayoutTest, CjkBreaksBetweenCharactersButKeepsClosingPunctuationAttached) {
+  auto cjk = Face("NotoSansCJK-Regular.ttc");
+  // Fullwidth characters are one em wide.
+  EXPECT_EQ(LayOut(U"中文中文中文", 2.5f, 0.0f, Text::ALIGN_LEFT, cjk.get()).line_count, 3u);
+  // "。" may not start a line: it stays with the character before it, which
+  // moves down with it: "中" / "文。" / "中".
+  const TextLayout layout = LayOut(U"中文。中", 2.5f, 0.0f, Text::ALIGN_LEFT, cjk.get());
+  EXPECT_EQ(layout.line_count, 3u);
+  ASSERT_EQ(layout.glyphs.size(), 4u);
+  EXPECT_NEAR(layout.glyphs[1].x, 0.0f, 1e-4f);
+  EXPECT_EQ(layout.glyphs[1].y, layout.glyphs[2].y);
+  EXPECT_LT(layout.glyphs[3].y, layout.glyphs[2].y);
+}
+
+TEST_F(TextLayoutTest, AlignmentPlacesLinesWithinTheContainer) {
+  const float width = LayOut(U"ab").bounds.width();
+  const Rect centred = LayOut(U"ab", 10.0f, 0.0f, Text::ALIGN_CENTER).bounds;
+  EXPECT_NEAR((centred.left + centred.right) / 2.0f, 5.0f, 0.05f);
+  const Rect right = LayOut(U"ab", 10.0f, 0.0f, Text::ALIGN_RIGHT).bounds;
+  EXPECT_NEAR(right.right, 10.0f, 0.05f);
+  EXPECT_NEAR(right.width(), width, 0.05f);
+  // Without a container width the text centres on x = 0.
+  const Rect around_zero = LayOut(U"ab", 0.0f, 0.0f, Text::ALIGN_CENTER).bounds;
+  EXPECT_NEAR(around_zero.left, -around_zero.right, 0.05f);
+}
+
+TEST_F(TextLayoutTest, RightToLeftRunsAreOrderedForDisplay) {
+  // A Hebrew paragraph: its first letter is the rightmost.
+  const TextLayout hebrew = LayOut(U"\u05D0\u05D1\u05D2");
+  EXPECT_GT(XOf(hebrew, *latin_, U'\u05D0'), XOf(hebrew, *latin_, U'\u05D1'));
+  EXPECT_GT(XOf(hebrew, *latin_, U'\u05D1'), XOf(hebrew, *latin_, U'\u05D2'));
+  // Hebrew inside a left-to-right paragraph: the Latin word first, then the
+  // Hebrew word read from its right end.
+  const TextLayout mixed = LayOut(U"abc \u05D0\u05D1\u05D2");
+  EXPECT_LT(XOf(mixed, *latin_, U'c'), XOf(mixed, *latin_, U'\u05D2'));
+  EXPECT_GT(XOf(mixed, *latin_, U'\u05D0'), XOf(mixed, *latin_, U'\u05D2'));
+  // A right-to-left paragraph with a Latin word: the Latin word reads left
+  // to right, to the left of the Hebrew word that precedes it.
+  const TextLayout rtl = LayOut(U"\u05D0\u05D1 abc");
+  EXPECT_LT(XOf(rtl, *latin_, U'a'), XOf(rtl, *latin_, U'b'));
+  EXPECT_LT(XOf(rtl, *latin_, U'c'), XOf(rtl, *latin_, U'\u05D1'));
+}
+
+TEST_F(TextLayoutTest, ArabicLettersJoin) {
+  auto arabic = Face("NotoSansArabic-Regular.ttf");
+  // Beh alone and beh joined to a following letter are different glyphs.
+  const TextLayout alone = LayOut(U"\u0628", 0.0f, 0.0f, Text::ALIGN_LEFT, arabic.get());
+  const TextLayout joined = LayOut(U"\u0628\u0628", 0.0f, 0.0f, Text::ALIGN_LEFT, arabic.get());
+  ASSERT_EQ(joined.glyphs.size(), 2u);
+  EXPECT_NE(joined.glyphs[0].glyph, alone.glyphs[0].glyph);
+  EXPECT_NE(joined.glyphs[1].glyph, alone.glyphs[0].glyph);
+}
+
+TEST_F(TextLayoutTest, BoundsHoldTheInkOfGlyphsThatLeaveTheLineBox) {
+  // A stack of combining marks rises far above the ascender.
+  const LineMetrics line = latin_->DefaultLineMetrics();
+  const TextLayout layout = LayOut(U"a\u0301\u0301\u0301\u0301\u0301");
+  EXPECT_GT(layout.bounds.top, 0.0f);
+  EXPECT_FLOAT_EQ(layout.bounds.bottom, -line.height());
+}
+
+TEST_F(TextLayoutTest, ReferenceCharacterSizesTheLineFromItsGlyphBox) {
+  auto cjk = Face("NotoSansCJK-Regular.ttc");
+  const LineMetrics reference = cjk->ReferenceLineMetrics(0xFF41);
+  EXPECT_NEAR(reference.height(), 1.0f, 1e-4f);
+  EXPECT_NEAR(reference.ascent, 0.88f, 1e-3f);  // the typographic ascender's share
+  EXPECT_GT(cjk->DefaultLineMetrics().height(), 1.4f);
+  // A character the font lacks leaves the default.
+  EXPECT_FLOAT_EQ(latin_->ReferenceLineMetrics(0x4E2D).height(),
+                  latin_->DefaultLineMetrics().height());
+}
+
+}  // namespace
+}  // namespace Vexel::internal
+
+namespace Vexel::internal {
+namespace {
+
+TEST(DistanceFieldTest, EncodesSignedPixelDistancesAroundTheOutline) {
+  // A 10 x 10 filled square whose left column is half covered.
+  std::vector<std::uint8_t> coverage(100, 255);
+  for (int y = 0; y < 10; ++y)
+    coverage[static_cast<std::size_t>(y) * 10] = 128;
+  const DistanceField field = ComputeDistanceField(coverage.data(), 10, 10, 10, 8);
+  ASSERT_EQ(field.width, 26);
+  ASSERT_EQ(field.height, 26);
+  auto at = [&](int x, int y) { return static_cast<int>(field.texels[y * 26 + x]); };
+  const int row = 13;
+  EXPECT_NEAR(at(8, row), 128, 1);           // the half-covered column holds the outline
+  EXPECT_NEAR(at(4, row), 128 - 64, 1);      // four pixels out
+  EXPECT_NEAR(at(12, row), 128 + 64, 1);     // four pixels in
+  EXPECT_EQ(at(0, row), 0);                  // the spread's far end, clamped
+  EXPECT_NEAR(at(13, 13), 128 + 5 * 16, 1);  // five pixels from the right edge
+  // Every row through the square rises monotonically towards the middle.
+  for (int x = 1; x <= 13; ++x)
+    EXPECT_GE(at(x, row), at(x - 1, row));
+}
+
+}  // namespace
+}  // namespace Vexel::internal
