@@ -19,8 +19,8 @@ namespace ocr_inpainting {
 namespace {
 
 // Every line of a block: its rectangle in block coordinates, the region of
-// the block patch it covers, and its masks (zeros until the analysis writes
-// them, which it does not for a line too small to analyse).
+// the block patch it covers, its masks (zeros until the analysis writes them,
+// which it does not for a line too small to analyse) and its vertical split.
 struct BlockLines {
   std::vector<cv::RotatedRect> rects;
   std::vector<cv::Rect> regions;
@@ -37,7 +37,7 @@ BlockLines LocateLines(const std::vector<cv::RotatedRect>& block_rects,
   lines.regions.resize(count);
   lines.masks.resize(count);
   lines.font_masks.resize(count);
-  lines.partitions.assign(count, 0);
+  lines.partitions.assign(count, -1);  // no split until the analysis finds one
   for (size_t i = 0; i < count; ++i) {
     const cv::Rect box = block_rects[i].boundingRect();
     OCR_LOGI("sep_roi: (%d,%d) %dx%d", box.x, box.y, box.width, box.height);

@@ -11,8 +11,8 @@ namespace ocr_inpainting {
 int InpaintImg(const cv::Mat& patch, cv::Mat* overlay, cv::Scalar& color) {
   cv::Mat mask;
   cv::Mat font_mask;
-  // Stays 0 (all columns) when the analysis finds no split.
-  int vertical_partition = 0;
+  // Stays -1 (no split: all columns) when the patch has no word gap.
+  int vertical_partition = -1;
   GetMask(patch, mask, font_mask, vertical_partition);
   OCR_LOGI("Inpainting_Process: detect vertical partition for fontcolor mask: %d",
            vertical_partition);
