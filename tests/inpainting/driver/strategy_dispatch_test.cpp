@@ -19,7 +19,7 @@ namespace ocr_inpainting {
 namespace {
 
 using ocr_testing::Background;
-using ocr_testing::TextLineSpec;
+using ocr_testing::DrawnTextLine;
 using ocr_testing::TextScene;
 
 struct Result {
@@ -44,10 +44,10 @@ cv::Size LinePatchSize(const cv::RotatedRect& rect) {
 // Black text on light grey, well apart, each line a different size.
 TextScene SeparateLines() {
   const cv::Mat background(360, 640, CV_8UC3, cv::Scalar(215, 215, 210));
-  std::vector<TextLineSpec> lines;
+  std::vector<DrawnTextLine> lines;
   const char* const words[] = {"Bahnhof", "Ausgang 3", "Kaffee", "Apotheke"};
   for (int k = 0; k < 4; ++k) {
-    TextLineSpec line;
+    DrawnTextLine line;
     line.text = words[k];
     line.centre = cv::Point2f(160.0f + 320.0f * float(k % 2), 70.0f + 90.0f * float(k));
     line.scale = 0.8 + 0.2 * k;
@@ -120,7 +120,7 @@ TEST(InpaintingRotImg, ReturnsResultsInRequestOrder) {
   // run in another order than the request's, yet every overlay lands at its
   // rectangle's index.
   const cv::Mat background(400, 600, CV_8UC3, cv::Scalar(230, 225, 220));
-  std::vector<TextLineSpec> lines(4);
+  std::vector<DrawnTextLine> lines(4);
   const cv::Point2f centres[] = {{450, 330}, {200, 80}, {200, 115}, {470, 60}};
   const char* const words[] = {"Ticket", "Tagesgericht", "Tagesgericht", "open"};
   const double scales[] = {1.4, 0.9, 0.9, 0.6};

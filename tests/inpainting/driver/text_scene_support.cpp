@@ -103,14 +103,14 @@ cv::Mat MakeBackground(Background kind, const cv::Size& size, uint64_t seed) {
   return out;
 }
 
-TextScene DrawTextLines(const cv::Mat& background, const std::vector<TextLineSpec>& lines) {
+TextScene DrawTextLines(const cv::Mat& background, const std::vector<DrawnTextLine>& lines) {
   TextScene scene;
   scene.background = background.clone();
   scene.lines = lines;
   cv::Mat frame;
   background.convertTo(frame, CV_32FC3);
   scene.text_alpha = cv::Mat::zeros(background.size(), CV_32FC1);
-  for (const TextLineSpec& line : lines) {
+  for (const DrawnTextLine& line : lines) {
     int baseline = 0;
     const cv::Size text =
         cv::getTextSize(line.text, line.font, line.scale, line.thickness, &baseline);
@@ -161,11 +161,11 @@ TextScene DrawTextLines(const cv::Mat& background, const std::vector<TextLineSpe
 TextScene MakeRandomTextScene(Background kind, const cv::Size& size, int count, uint64_t seed) {
   cv::RNG rng(seed ^ 0x5eedULL);
   const cv::Mat background = MakeBackground(kind, size, seed);
-  std::vector<TextLineSpec> lines;
+  std::vector<DrawnTextLine> lines;
   const int rows = std::max(count, 1);
   const float row_height = float(size.height) / float(rows);
   for (int k = 0; k < count; ++k) {
-    TextLineSpec line;
+    DrawnTextLine line;
     line.text = kWords[rng.uniform(0, int(std::size(kWords)))];
     if (rng.uniform(0, 2) == 1)
       line.text += std::string(" ") + kWords[rng.uniform(0, int(std::size(kWords)))];

@@ -12,7 +12,7 @@ namespace ocr_testing {
 
 enum class Background { kGradient, kTexture, kPhoto };
 
-struct TextLineSpec {
+struct DrawnTextLine {
   std::string text;
   cv::Point2f centre;  // of the text box, in frame pixels
   float angle = 0;     // degrees, cv::RotatedRect convention
@@ -25,7 +25,7 @@ struct TextLineSpec {
 struct TextScene {
   cv::Mat frame;       // CV_8UC3, R, G, B: background with the text drawn
   cv::Mat background;  // the same without the text
-  std::vector<TextLineSpec> lines;
+  std::vector<DrawnTextLine> lines;
   // Per line: the box the host would send, i.e. the tight text box enlarged
   // by the host's width and height ratios.
   std::vector<cv::RotatedRect> rects;
@@ -36,7 +36,7 @@ struct TextScene {
 cv::Mat MakeBackground(Background kind, const cv::Size& size, uint64_t seed);
 
 // Draws `lines` (anti-aliased, rotated about their centres) onto `background`.
-TextScene DrawTextLines(const cv::Mat& background, const std::vector<TextLineSpec>& lines);
+TextScene DrawTextLines(const cv::Mat& background, const std::vector<DrawnTextLine>& lines);
 
 // A frame with `count` random lines of words on the given background.
 TextScene MakeRandomTextScene(Background kind, const cv::Size& size, int count, uint64_t seed);
