@@ -23,7 +23,7 @@ namespace {
 using namespace ocr_inpainting;
 using ocr_testing::Background;
 using ocr_testing::CoveredShare;
-using ocr_testing::PatchSpec;
+using ocr_testing::PatchRecipe;
 using ocr_testing::SyntheticPatch;
 
 double DeltaE(const cv::Scalar& a, const cv::Scalar& b) {
@@ -37,10 +37,10 @@ double MaxChannelDiff(const cv::Scalar& a, const cv::Scalar& b) {
   return std::max({std::abs(a[0] - b[0]), std::abs(a[1] - b[1]), std::abs(a[2] - b[2])});
 }
 
-double DrawnContrast(const PatchSpec& spec) {
+double DrawnContrast(const PatchRecipe& recipe) {
   cv::Scalar text, background;
-  GetLinearRGBColor(spec.text_color, text);
-  GetLinearRGBColor(spec.background_color, background);
+  GetLinearRGBColor(recipe.text_color, text);
+  GetLinearRGBColor(recipe.background_color, background);
   return GetContrastRatio(GetEffectiveLuminance(text), GetEffectiveLuminance(background));
 }
 
@@ -107,10 +107,10 @@ void PrintGroups(const std::map<std::string, GroupStats>& groups) {
 }
 
 // The library's own path: GetMask, the pipeline's erase step, GetFontColor.
-void MeasureLibrary(const std::vector<PatchSpec>& specs) {
+void MeasureLibrary(const std::vector<PatchRecipe>& recipes) {
   std::map<std::string, GroupStats> groups;
-  for (const PatchSpec& spec : specs) {
-    const SyntheticPatch patch = ocr_testing::DrawTextPatch(spec);
+  for (const PatchRecipe& recipe : recipes) {
+    const SyntheticPatch patch = ocr_testing::DrawTextPatch(recipe);
     cv::Mat mask, font_mask;
     int vertical_partition = -1;
     GetMask(patch.rgb, mask, font_mask, vertical_partition);
@@ -118,12 +118,12 @@ void MeasureLibrary(const std::vector<PatchSpec>& specs) {
     GetFontColor(patch.rgb, mask, patch.background, font_mask, ideal);
     GetFontColor(patch.rgb, mask, ocr_testing::TeleaFill(patch.rgb, mask), font_mask, telea);
 
-    const bool light = cv::sum(spec.text_color)[0] > cv::sum(spec.background_color)[0];
-    const bool forced = DrawnContrast(spec) < 4.5;
+    const bool light = cv::sum(recipe.text_color)[0] > cv::sum(recipe.background_color)[0];
+    const bool forced = DrawnContrast(recipe) < 4.5;
     const std::string keys[] = {
         "all",
         std::string(light ? "light on dark" : "dark on light"),
-        std::string("background ") + BackgroundName(spec.background),
+        std::string("background ") + BackgroundName(recipe.background),
         std::string(forced ? "contrast < 4.5 (forced)" : "contrast >= 4.5"),
     };
     for (const std::string& key : keys) {
@@ -134,9 +134,9 @@ void MeasureLibrary(const std::vector<PatchSpec>& specs) {
       g.text_in_font.Add(CoveredShare(font_mask, patch.TextPixels()));
       g.inverted += CoveredShare(font_mask, patch.TextPixels()) < 0.5 ? 1 : 0;
       g.bg_in_font.Add(CoveredShare(font_mask, patch.BackgroundPixels()));
-      g.de_ideal.Add(DeltaE(ideal, spec.text_color));
-      g.de_telea.Add(DeltaE(telea, spec.text_color));
-      g.channel_telea.Add(MaxChannelDiff(telea, spec.text_color));
+      g.de_ideal.Add(DeltaE(ideal, recipe.text_color));
+      g.de_telea.Add(DeltaE(telea, recipe.text_color));
+      g.channel_telea.Add(MaxChannelDiff(telea, recipe.text_color));
     }
   }
   PrintGroups(groups);
@@ -144,7 +144,7 @@ void MeasureLibrary(const std::vector<PatchSpec>& specs) {
 
 // The colour's text-pixel selection: measured colour (before the contrast
 // rule) against the drawn colour, with the pipeline's erase step.
-void CompareTextSelection(const std::vector<PatchSpec>& specs) {
+void CompareTextSelection(const std::vector<PatchRecipe>& recipes) {
   using analysis_variants::Fallback;
   using analysis_variants::TextSelection;
   const std::pair<const char*, std::pair<TextSelection, Fallback>> variants[] = {
@@ -164,17 +164,17 @@ void CompareTextSelection(const std::vector<PatchSpec>& specs) {
   std::printf("%-52s %-16s %-16s %8s\n", "", "median (p90)", "median (p90)", "mean");
   for (const auto& [name, choice] : variants) {
     Stats measured, final_color, channel;
-    for (const PatchSpec& spec : specs) {
-      const SyntheticPatch patch = ocr_testing::DrawTextPatch(spec);
+    for (const PatchRecipe& recipe : recipes) {
+      const SyntheticPatch patch = ocr_testing::DrawTextPatch(recipe);
       cv::Mat mask, font_mask;
       int vertical_partition = -1;
       GetMask(patch.rgb, mask, font_mask, vertical_partition);
       const auto r =
           analysis_variants::FontColor(patch.rgb, mask, ocr_testing::TeleaFill(patch.rgb, mask),
                                        font_mask, choice.first, choice.second);
-      measured.Add(DeltaE(r.measured, spec.text_color));
-      final_color.Add(DeltaE(r.final, spec.text_color));
-      channel.Add(MaxChannelDiff(r.measured, spec.text_color));
+      measured.Add(DeltaE(r.measured, recipe.text_color));
+      final_color.Add(DeltaE(r.final, recipe.text_color));
+      channel.Add(MaxChannelDiff(r.measured, recipe.text_color));
     }
     std::printf("%-52s %6.2f (%6.2f)  %6.2f (%6.2f)  %8.2f\n", name, measured.Quantile(0.5),
                 measured.Quantile(0.9), final_color.Quantile(0.5), final_color.Quantile(0.9),
@@ -184,33 +184,33 @@ void CompareTextSelection(const std::vector<PatchSpec>& specs) {
 
 // Text covering little of its patch: a lone mark or small print in a box
 // that the host enlarged generously.
-std::vector<PatchSpec> SparseSpecs(int count, uint64_t seed) {
+std::vector<PatchRecipe> SparseRecipes(int count, uint64_t seed) {
   static const char* kMarks[] = {"-", ".", "i", "1", "l", ":", "Ok", "no"};
   cv::RNG rng(seed);
-  std::vector<PatchSpec> specs;
+  std::vector<PatchRecipe> recipes;
   for (int i = 0; i < count; ++i) {
-    PatchSpec spec;
-    spec.lines = {kMarks[i % 8]};
-    spec.font_face = rng.uniform(0, 2) == 0 ? cv::FONT_HERSHEY_SIMPLEX : cv::FONT_HERSHEY_DUPLEX;
-    spec.font_scale = rng.uniform(0.4, 0.9);
-    spec.thickness = rng.uniform(1, 3);
-    spec.size = cv::Size(rng.uniform(100, 240), rng.uniform(30, 60));
+    PatchRecipe recipe;
+    recipe.lines = {kMarks[i % 8]};
+    recipe.font_face = rng.uniform(0, 2) == 0 ? cv::FONT_HERSHEY_SIMPLEX : cv::FONT_HERSHEY_DUPLEX;
+    recipe.font_scale = rng.uniform(0.4, 0.9);
+    recipe.thickness = rng.uniform(1, 3);
+    recipe.size = cv::Size(rng.uniform(100, 240), rng.uniform(30, 60));
     const bool light = rng.uniform(0, 2) == 0;
     const int text = light ? rng.uniform(200, 256) : rng.uniform(0, 60);
     const int back = light ? rng.uniform(0, 60) : rng.uniform(190, 256);
-    spec.text_color = cv::Scalar(text, text * 0.9, text * 0.8);
-    spec.background_color = cv::Scalar::all(back);
-    spec.background = i % 3 == 0 ? Background::kTexture : Background::kFlat;
-    spec.background_color2 = cv::Scalar::all(5);
-    spec.seed = rng.next();
-    specs.push_back(spec);
+    recipe.text_color = cv::Scalar(text, text * 0.9, text * 0.8);
+    recipe.background_color = cv::Scalar::all(back);
+    recipe.background = i % 3 == 0 ? Background::kTexture : Background::kFlat;
+    recipe.background_color2 = cv::Scalar::all(5);
+    recipe.seed = rng.next();
+    recipes.push_back(recipe);
   }
-  return specs;
+  return recipes;
 }
 
 // The sparse-text rule: operands of the 5 % test and the font mask copy.
 // "differ" counts the patches whose mask or colour is not the library's.
-void CompareSparseRule(const std::vector<PatchSpec>& specs) {
+void CompareSparseRule(const std::vector<PatchRecipe>& recipes) {
   using analysis_variants::SparseCount;
   const std::pair<const char*, std::pair<SparseCount, bool>> variants[] = {
       {"count outlines + dilated sum, font kept [library]",
@@ -230,9 +230,9 @@ void CompareSparseRule(const std::vector<PatchSpec>& specs) {
     int sparse = 0;
     int differ = 0;
     Stats text_in_mask, bg, far_bg, de;
-    for (size_t i = 0; i < specs.size(); ++i) {
-      const PatchSpec& spec = specs[i];
-      const SyntheticPatch patch = ocr_testing::DrawTextPatch(spec);
+    for (size_t i = 0; i < recipes.size(); ++i) {
+      const PatchRecipe& recipe = recipes[i];
+      const SyntheticPatch patch = ocr_testing::DrawTextPatch(recipe);
       const auto m = analysis_variants::InpaintingMask(patch.rgb, choice.first, choice.second);
       sparse += m.sparse ? 1 : 0;
       text_in_mask.Add(CoveredShare(m.mask, patch.TextPixels()));
@@ -241,8 +241,8 @@ void CompareSparseRule(const std::vector<PatchSpec>& specs) {
       cv::Scalar color;
       GetFontColor(patch.rgb, m.mask, ocr_testing::TeleaFill(patch.rgb, m.mask), m.font_mask,
                    color);
-      de.Add(DeltaE(color, spec.text_color));
-      if (library_masks.size() < specs.size()) {
+      de.Add(DeltaE(color, recipe.text_color));
+      if (library_masks.size() < recipes.size()) {
         library_masks.push_back(m.mask);
         library_colors.push_back(color);
       } else if (cv::norm(m.mask, library_masks[i], cv::NORM_INF) > 0 ||
@@ -263,19 +263,19 @@ int main(int argc, char** argv) {
   setenv("OCRAR_LOG_LEVEL", "6", 0);
   const int count = argc > 1 ? std::atoi(argv[1]) : 120;
   const uint64_t seed = argc > 2 ? std::strtoull(argv[2], nullptr, 10) : 2024;
-  const std::vector<PatchSpec> specs = ocr_testing::VariedSpecs(count, seed);
+  const std::vector<PatchRecipe> recipes = ocr_testing::VariedRecipes(count, seed);
   std::printf("%d generated patches (seed %llu): Hershey faces, 1-2 words or lines, sizes %s\n",
               count, static_cast<unsigned long long>(seed), "from the text, 25-35 % margins");
   std::printf(
       "text = pixels at least half covered by text; bg = pixels no text touches; far bg = more "
       "than 5 px from text.\ndE = CIE76 distance to the drawn colour in Lab (L 0..100); maxch = "
       "largest channel difference on 0..255.\n\n");
-  MeasureLibrary(specs);
-  CompareTextSelection(specs);
-  const std::vector<PatchSpec> sparse = SparseSpecs(48, seed + 1);
+  MeasureLibrary(recipes);
+  CompareTextSelection(recipes);
+  const std::vector<PatchRecipe> sparse = SparseRecipes(48, seed + 1);
   std::printf("\n48 sparse patches (a lone mark or short word in a large box):\n");
   CompareSparseRule(sparse);
   std::printf("\nThe %d varied patches above:\n", count);
-  CompareSparseRule(specs);
+  CompareSparseRule(recipes);
   return 0;
 }

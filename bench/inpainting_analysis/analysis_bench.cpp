@@ -11,13 +11,13 @@
 namespace {
 
 ocr_testing::SyntheticPatch LinePatch(int width) {
-  ocr_testing::PatchSpec spec;
-  spec.size = {width, width / 5};
-  spec.lines = {"Exit 12 open"};
-  spec.font_scale = width / 240.0;
-  spec.background = ocr_testing::Background::kTexture;
-  spec.background_color2 = cv::Scalar::all(6);
-  return ocr_testing::DrawTextPatch(spec);
+  ocr_testing::PatchRecipe recipe;
+  recipe.size = {width, width / 5};
+  recipe.lines = {"Exit 12 open"};
+  recipe.font_scale = width / 240.0;
+  recipe.background = ocr_testing::Background::kTexture;
+  recipe.background_color2 = cv::Scalar::all(6);
+  return ocr_testing::DrawTextPatch(recipe);
 }
 
 void BM_GetMask(benchmark::State& state) {

@@ -97,7 +97,7 @@ TEST(GetBinaryImgNormalized, ErodesACopySoARegionIgnoresItsSurroundings) {
 }
 
 ocr_testing::SyntheticPatch DarkTextPatch() {
-  return ocr_testing::DrawTextPatch(ocr_testing::PatchSpec{});
+  return ocr_testing::DrawTextPatch(ocr_testing::PatchRecipe{});
 }
 
 TEST(BinarisationMethods, HlsMarksDarkClaheMarksBrightPcaSeparates) {

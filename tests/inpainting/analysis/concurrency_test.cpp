@@ -29,8 +29,8 @@ Analysis Analyse(const cv::Mat& patch) {
 
 TEST(AnalysisConcurrency, ParallelWorkersMatchTheSerialRun) {
   std::vector<cv::Mat> patches;
-  for (const auto& spec : ocr_testing::VariedSpecs(48, 11))
-    patches.push_back(ocr_testing::DrawTextPatch(spec).rgb);
+  for (const auto& recipe : ocr_testing::VariedRecipes(48, 11))
+    patches.push_back(ocr_testing::DrawTextPatch(recipe).rgb);
 
   std::vector<Analysis> serial;
   for (const cv::Mat& patch : patches)

@@ -14,7 +14,7 @@ using namespace ocr_inpainting;
 using ocr::log::kDebug;
 using ocr::log::kError;
 using ocr_testing::Background;
-using ocr_testing::PatchSpec;
+using ocr_testing::PatchRecipe;
 
 const cv::Scalar kBlack(0, 0, 0, 0);
 
@@ -86,7 +86,7 @@ cv::Scalar MeasureColor(const ocr_testing::SyntheticPatch& patch) {
 }
 
 TEST(GetFontColor, FindsDrawnColourOnFlatGradientAndTexturedBackgrounds) {
-  PatchSpec dark, light, red, blue;
+  PatchRecipe dark, light, red, blue;
   light.text_color = {240, 240, 240};
   light.background_color = {30, 40, 50};
   red.text_color = {200, 30, 30};
@@ -96,23 +96,23 @@ TEST(GetFontColor, FindsDrawnColourOnFlatGradientAndTexturedBackgrounds) {
   blue.background = Background::kTexture;
   blue.background_color = {220, 210, 190};
   blue.background_color2 = {8, 8, 8};
-  for (const PatchSpec& spec : {dark, light, red, blue}) {
-    const cv::Scalar color = MeasureColor(ocr_testing::DrawTextPatch(spec));
+  for (const PatchRecipe& recipe : {dark, light, red, blue}) {
+    const cv::Scalar color = MeasureColor(ocr_testing::DrawTextPatch(recipe));
     for (int c = 0; c < 3; ++c)
-      EXPECT_NEAR(color[c], spec.text_color[c], 6.0) << spec.text_color << " -> " << color;
+      EXPECT_NEAR(color[c], recipe.text_color[c], 6.0) << recipe.text_color << " -> " << color;
   }
 }
 
 TEST(GetFontColor, ShortPatchKeepsFullHeightAndWeakTextIsEnhanced) {
-  PatchSpec spec;
-  spec.size = {60, 6};
-  spec.lines = {"-----"};
-  spec.font_scale = 0.5;
-  spec.thickness = 1;
-  spec.text_color = {150, 150, 150};
-  spec.background_color = {210, 210, 210};
+  PatchRecipe recipe;
+  recipe.size = {60, 6};
+  recipe.lines = {"-----"};
+  recipe.font_scale = 0.5;
+  recipe.thickness = 1;
+  recipe.text_color = {150, 150, 150};
+  recipe.background_color = {210, 210, 210};
   ocr::log::ScopedCapture capture;
-  const cv::Scalar color = MeasureColor(ocr_testing::DrawTextPatch(spec));
+  const cv::Scalar color = MeasureColor(ocr_testing::DrawTextPatch(recipe));
   EXPECT_TRUE(capture.Contains("GetFontColor: x_margin=7 y_margin=0", kDebug));
   EXPECT_TRUE(capture.Contains("GetFontColor: text_roi: (7,0,46,6)", kDebug));
   EXPECT_EQ(capture.Count("DetectTextColor - Average color has sufficient contrast"), 0);
@@ -120,9 +120,9 @@ TEST(GetFontColor, ShortPatchKeepsFullHeightAndWeakTextIsEnhanced) {
 }
 
 TEST(GetFontColor, EmptyFontMaskFallsBackToTheInpaintingMask) {
-  PatchSpec spec;
-  spec.text_color = {30, 60, 150};
-  const auto patch = ocr_testing::DrawTextPatch(spec);
+  PatchRecipe recipe;
+  recipe.text_color = {30, 60, 150};
+  const auto patch = ocr_testing::DrawTextPatch(recipe);
   cv::Mat mask, font_mask;
   int vertical_partition = -1;
   GetMask(patch.rgb, mask, font_mask, vertical_partition);
@@ -131,7 +131,7 @@ TEST(GetFontColor, EmptyFontMaskFallsBackToTheInpaintingMask) {
       GetFontColor(patch.rgb, mask, patch.background, cv::Mat::zeros(mask.size(), CV_8UC1), color),
       0);
   for (int c = 0; c < 3; ++c)
-    EXPECT_NEAR(color[c], spec.text_color[c], 12.0) << color;
+    EXPECT_NEAR(color[c], recipe.text_color[c], 12.0) << color;
 }
 
 TEST(DetectTextColor, BlackTextIsKeptAndReportedAsSufficient) {

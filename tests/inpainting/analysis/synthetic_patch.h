@@ -13,7 +13,7 @@ namespace ocr_testing {
 
 enum class Background { kFlat, kGradient, kTexture };
 
-struct PatchSpec {
+struct PatchRecipe {
   cv::Size size{160, 40};
   // One entry per text line, laid out top to bottom and centred.
   std::vector<std::string> lines{"Text"};
@@ -38,16 +38,16 @@ struct SyntheticPatch {
   cv::Mat BackgroundPixels() const;
 };
 
-SyntheticPatch DrawTextPatch(const PatchSpec& spec);
+SyntheticPatch DrawTextPatch(const PatchRecipe& recipe);
 
-// `count` varied specs drawn from a seeded generator: Hershey font faces,
+// `count` varied recipes drawn from a seeded generator: Hershey font faces,
 // sizes, one or two words or lines, dark-on-light and light-on-dark colours,
 // flat, gradient and textured backgrounds. Text contrast is kept readable
 // (luminance ratio at least 3).
-std::vector<PatchSpec> VariedSpecs(int count, uint64_t seed);
+std::vector<PatchRecipe> VariedRecipes(int count, uint64_t seed);
 
 // Background of the given kind, without text.
-cv::Mat DrawBackground(const PatchSpec& spec);
+cv::Mat DrawBackground(const PatchRecipe& recipe);
 
 // Blends `color` over `background` with the 0..255 coverage as alpha.
 cv::Mat Compose(const cv::Mat& background, const cv::Mat& coverage, const cv::Scalar& color);

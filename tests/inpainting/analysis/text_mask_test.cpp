@@ -16,7 +16,7 @@ using ocr::log::kInfo;
 using ocr::log::kWarn;
 using ocr_testing::Background;
 using ocr_testing::CoveredShare;
-using ocr_testing::PatchSpec;
+using ocr_testing::PatchRecipe;
 
 struct Masks {
   cv::Mat mask, font_mask;
@@ -39,7 +39,7 @@ cv::Mat FarBackground(const ocr_testing::SyntheticPatch& patch) {
 }
 
 TEST(GetMask, CoversTextNotBackgroundWithTextPolarityInBothMasks) {
-  PatchSpec dark, light, red, blue;
+  PatchRecipe dark, light, red, blue;
   light.text_color = {240, 240, 240};
   light.background_color = {30, 40, 50};
   red.text_color = {200, 30, 30};
@@ -49,23 +49,23 @@ TEST(GetMask, CoversTextNotBackgroundWithTextPolarityInBothMasks) {
   blue.background = Background::kTexture;
   blue.background_color = {220, 210, 190};
   blue.background_color2 = {8, 8, 8};
-  for (const PatchSpec& spec : {dark, light, red, blue}) {
-    const auto patch = ocr_testing::DrawTextPatch(spec);
+  for (const PatchRecipe& recipe : {dark, light, red, blue}) {
+    const auto patch = ocr_testing::DrawTextPatch(recipe);
     const Masks m = RunGetMask(patch.rgb);
     ASSERT_EQ(m.status, 0);
-    EXPECT_EQ(CoveredShare(m.mask, patch.TextPixels()), 1.0) << spec.text_color;
-    EXPECT_EQ(CoveredShare(m.mask, FarBackground(patch)), 0.0) << spec.text_color;
+    EXPECT_EQ(CoveredShare(m.mask, patch.TextPixels()), 1.0) << recipe.text_color;
+    EXPECT_EQ(CoveredShare(m.mask, FarBackground(patch)), 0.0) << recipe.text_color;
     // The font mask holds the strokes, whichever way round the contrast is.
-    EXPECT_GT(CoveredShare(m.font_mask, patch.TextPixels()), 0.97) << spec.text_color;
-    EXPECT_LT(CoveredShare(m.font_mask, patch.BackgroundPixels()), 0.01) << spec.text_color;
+    EXPECT_GT(CoveredShare(m.font_mask, patch.TextPixels()), 0.97) << recipe.text_color;
+    EXPECT_LT(CoveredShare(m.font_mask, patch.BackgroundPixels()), 0.01) << recipe.text_color;
   }
 }
 
 TEST(GetMask, TwoWordsSplitAtTheSecondWord) {
-  PatchSpec spec;
-  spec.size = {240, 40};
-  spec.lines = {"ab       cd"};
-  const auto patch = ocr_testing::DrawTextPatch(spec);
+  PatchRecipe recipe;
+  recipe.size = {240, 40};
+  recipe.lines = {"ab       cd"};
+  const auto patch = ocr_testing::DrawTextPatch(recipe);
   const Masks m = RunGetMask(patch.rgb);
   // The widest run of columns without ink lies between the words.
   cv::Mat ink_columns;
@@ -119,12 +119,12 @@ TEST(GetInpaintingMask, AllWhiteMaskGetsABlackFrame) {
 
 TEST(GetInpaintingMask, RegionOfALargerImageGivesTheSameMasksAsACopy) {
   // The block path hands in regions of the block patch and its edge mask.
-  PatchSpec spec;
-  spec.size = {200, 90};
-  spec.lines = {"Menu", "Carte"};
-  spec.background = Background::kTexture;
-  spec.background_color2 = {6, 6, 6};
-  const auto block = ocr_testing::DrawTextPatch(spec);
+  PatchRecipe recipe;
+  recipe.size = {200, 90};
+  recipe.lines = {"Menu", "Carte"};
+  recipe.background = Background::kTexture;
+  recipe.background_color2 = {6, 6, 6};
+  const auto block = ocr_testing::DrawTextPatch(recipe);
   cv::Mat edges;
   cv::morphologyEx(block.rgb, edges, cv::MORPH_GRADIENT, cv::Mat::ones(3, 3, CV_8U));
   cv::cvtColor(edges, edges, cv::COLOR_RGB2GRAY);
