@@ -1,6 +1,7 @@
 #include "inpainting/driver/strategy_dispatch.h"
 
 #include <atomic>
+#include <optional>
 
 #include <tbb/blocked_range.h>
 #include <tbb/parallel_for.h>
@@ -47,6 +48,28 @@ RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& value
     return RequestCheck::kImageTooSmall;
   }
   return RequestCheck::kAccepted;
+}
+
+// Front shared by the block and line strategies: announce, check, decode the
+// rectangles and size the outputs. Gives the status to return at once, or
+// nothing when the strategy goes on with `rects`.
+std::optional<int> BeginStrategy(const char* banner, const cv::Mat& image,
+                                 const std::vector<double>& values, std::vector<cv::Mat>& overlays,
+                                 std::vector<cv::Scalar>& colors,
+                                 std::vector<cv::RotatedRect>& rects) {
+  OCR_LOGI("%s", banner);
+  switch (CheckRequest(image, values)) {
+    case RequestCheck::kRefused:
+      return -1;
+    case RequestCheck::kImageTooSmall:
+      return 0;
+    case RequestCheck::kAccepted:
+      break;
+  }
+  rects = TransformVector2RotatedRect(values);
+  overlays.resize(rects.size());
+  colors.assign(rects.size(), cv::Scalar::all(0));
+  return std::nullopt;
 }
 
 // Overlay of a cut patch too small to erase: the patch itself, transparent,
@@ -146,35 +169,19 @@ int InpaintingRotImgSmartVersion(const cv::Mat& image, const std::vector<double>
 
 int InpaintingRotImgBlockVersion(const cv::Mat& image, const std::vector<double>& values,
                                  std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors) {
-  OCR_LOGI(" Start Inpainting Block Version");
-  switch (CheckRequest(image, values)) {
-    case RequestCheck::kRefused:
-      return -1;
-    case RequestCheck::kImageTooSmall:
-      return 0;
-    case RequestCheck::kAccepted:
-      break;
-  }
-  const std::vector<cv::RotatedRect> rects = TransformVector2RotatedRect(values);
-  overlays.resize(rects.size());
-  colors.assign(rects.size(), cv::Scalar::all(0));
+  std::vector<cv::RotatedRect> rects;
+  if (const auto status =
+          BeginStrategy(" Start Inpainting Block Version", image, values, overlays, colors, rects))
+    return *status;
   return InpaintImgBlockVersion(image, rects, overlays, colors);
 }
 
 int InpaintingRotImgLineVersion(const cv::Mat& image, const std::vector<double>& values,
                                 std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors) {
-  OCR_LOGI(" Start Inpainting Line Version");
-  switch (CheckRequest(image, values)) {
-    case RequestCheck::kRefused:
-      return -1;
-    case RequestCheck::kImageTooSmall:
-      return 0;
-    case RequestCheck::kAccepted:
-      break;
-  }
-  const std::vector<cv::RotatedRect> rects = TransformVector2RotatedRect(values);
-  overlays.resize(rects.size());
-  colors.assign(rects.size(), cv::Scalar::all(0));
+  std::vector<cv::RotatedRect> rects;
+  if (const auto status =
+          BeginStrategy(" Start Inpainting Line Version", image, values, overlays, colors, rects))
+    return *status;
 
   // Every failing line stores the same -1; no lock is needed.
   std::atomic<int> result{0};
