@@ -17,7 +17,7 @@ packages=(
   # headless drawing: EGL + GLES2 on Mesa's software rasteriser
   libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
   # text: glyphs, shaping, bidi, and fonts for Latin, CJK, Arabic, Hebrew
-  libfreetype-dev libharfbuzz-dev libfribidi-dev
+  libfreetype-dev libharfbuzz-dev libfribidi-dev libicu-dev
   fonts-noto-cjk fonts-wqy-microhei fonts-noto-core fonts-dejavu-core
 )
 

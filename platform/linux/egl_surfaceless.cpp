@@ -41,25 +41,22 @@ class SurfacelessDevice : public GlDevice {
   SurfacelessDevice() : display_(SurfacelessDisplay()) {
     if (!eglInitialize(display_, nullptr, nullptr))
       throw std::runtime_error(EglFailure("eglInitialize"));
-    if (!eglBindAPI(EGL_OPENGL_ES_API)) {
-      eglTerminate(display_);
+    if (!eglBindAPI(EGL_OPENGL_ES_API))
       throw std::runtime_error(EglFailure("eglBindAPI"));
-    }
     // A context without a config: it draws only into framebuffer objects.
     const EGLint attributes[] = {EGL_CONTEXT_CLIENT_VERSION, 2, EGL_NONE};
     context_ = eglCreateContext(display_, EGL_NO_CONFIG_KHR, EGL_NO_CONTEXT, attributes);
-    if (context_ == EGL_NO_CONTEXT) {
-      const std::string failure = EglFailure("eglCreateContext");
-      eglTerminate(display_);
-      throw std::runtime_error(failure);
-    }
+    if (context_ == EGL_NO_CONTEXT)
+      throw std::runtime_error(EglFailure("eglCreateContext"));
   }
 
+  // The display stays initialised for the rest of the process: the next
+  // device gets it back at no cost, and Mesa keeps its driver loaded (so
+  // that what the driver allocates stays attributable to it).
   ~SurfacelessDevice() override {
     if (eglGetCurrentContext() == context_)
       eglMakeCurrent(display_, EGL_NO_SURFACE, EGL_NO_SURFACE, EGL_NO_CONTEXT);
     eglDestroyContext(display_, context_);
-    eglTerminate(display_);
     eglReleaseThread();
   }
 

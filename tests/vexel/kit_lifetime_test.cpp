@@ -1,3 +1,7 @@
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+
 #include "headless_scene.h"
 
 namespace vexel_test {
@@ -155,6 +159,75 @@ TEST_F(KitLifetimes, EverythingReleasedReturnsTheDeviceToItsFormerCount) {
     EXPECT_GT(Kit::getLiveGpuObjectCount(), before);
   }
   EXPECT_EQ(Kit::getLiveGpuObjectCount(), before);
+}
+
+}  // namespace
+}  // namespace vexel_test
+
+namespace vexel_test {
+namespace {
+
+TEST(KitResources, MadeBeforeAnyRendererTheyDrawOnceOneExists) {
+  Vexel::Kit kit(nullptr, "");
+  Vexel::Texture texture(kit.getResourceManager(), "Early", Vexel::Texture::TYPE_2D, false);
+  const unsigned char magenta[] = {255, 0, 255, 255};
+  texture.setImage(magenta, 1, 1, Vexel::Texture::PIXEL_FORMAT_RGBA8);
+  Vexel::Material material(kit.getResourceManager());
+  material.setShader(Vexel::Material::SHADER_VERTEX, "QuadVertex", kQuadVertex);
+  material.setShader(Vexel::Material::SHADER_FRAGMENT, "QuadFragment", kQuadFragment);
+  material.setShaderSampler(Vexel::Material::SHADER_FRAGMENT, "diffuseMap", &texture);
+  material.setShaderAutoUniform(Vexel::Material::SHADER_VERTEX, "worldViewProj",
+                                Vexel::Material::AUTO_UNIFORM_WORLD_VIEW_PROJECTION_MATRIX);
+  Vexel::Mesh mesh("Early");
+  mesh.begin(4, 0, Vexel::Mesh::RENDER_TRIANGLE_STRIP);
+  for (const auto& corner : {Vexel::Vector2(1, -1), Vexel::Vector2(1, 1), Vexel::Vector2(-1, -1),
+                             Vexel::Vector2(-1, 1)}) {
+    mesh.position(corner.x, corner.y, 0);
+    mesh.textureCoord(0, 0);
+  }
+  mesh.end();
+  mesh.finalize();
+  Vexel::Object quad(mesh);
+  quad.setMaterial(0, &material);
+  quad.setPosition(0, 0, -5);
+
+  for (int renderer_generation = 0; renderer_generation < 2; ++renderer_generation) {
+    ANativeWindow* window = platform::desktop::CreateOffscreenWindow(4, 4);
+    Vexel::AndroidSurfaceRenderer renderer(kit, window, Vexel::Renderer::ANTI_ALIASING_NONE);
+    Vexel::Scene scene(kit);
+    Vexel::Camera camera;
+    camera.setParent(scene.getRootNode());
+    camera.setProjectionMode(Vexel::PROJECTION_ORTHOGRAPHIC);
+    camera.setOrthographicWindowSize(2, 2);
+    quad.setParent(scene.getRootNode());
+    renderer.setScene(&scene);
+    kit.drawAll();
+    const std::vector<std::uint8_t> frame = platform::desktop::ReadFrame(window);
+    EXPECT_EQ(frame[0], 255);
+    EXPECT_EQ(frame[1], 0);
+    EXPECT_EQ(frame[2], 255);
+    ANativeWindow_release(window);
+  }
+}
+
+TEST(KitLog, ABareLogNameGoesToTheKitLogDirectory) {
+  const std::string directory = ::testing::TempDir() + "vexel-log-test";
+  ASSERT_EQ(setenv("VEXEL_LOG_DIR", directory.c_str(), 1), 0);
+  {
+    Vexel::Kit kit(nullptr, "Vexel.log");
+    EXPECT_EQ(kit.getLogFilePath(), directory + "/Vexel.log");
+  }
+  unsetenv("VEXEL_LOG_DIR");
+  std::ifstream log(directory + "/Vexel.log");
+  std::string first_line;
+  std::getline(log, first_line);
+  EXPECT_NE(first_line.find(" I Vexel: kit created"), std::string::npos) << first_line;
+
+  log.close();
+  std::filesystem::remove_all(directory);
+
+  Vexel::Kit quiet(nullptr, "");
+  EXPECT_EQ(quiet.getLogFilePath(), "");
 }
 
 }  // namespace

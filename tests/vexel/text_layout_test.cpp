@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "distance_field.h"
 #include "font_face.h"
 #include "text_layout.h"
 #include "unicode_text.h"
@@ -170,6 +171,32 @@ TEST_F(TextLayoutTest, ReferenceCharacterSizesTheLineFromItsGlyphBox) {
   // A character the font lacks leaves the default.
   EXPECT_FLOAT_EQ(latin_->ReferenceLineMetrics(0x4E2D).height(),
                   latin_->DefaultLineMetrics().height());
+}
+
+}  // namespace
+}  // namespace Vexel::internal
+
+namespace Vexel::internal {
+namespace {
+
+TEST(DistanceFieldTest, EncodesSignedPixelDistancesAroundTheOutline) {
+  // A 10 x 10 filled square whose left column is half covered.
+  std::vector<std::uint8_t> coverage(100, 255);
+  for (int y = 0; y < 10; ++y)
+    coverage[static_cast<std::size_t>(y) * 10] = 128;
+  const DistanceField field = ComputeDistanceField(coverage.data(), 10, 10, 10, 8);
+  ASSERT_EQ(field.width, 26);
+  ASSERT_EQ(field.height, 26);
+  auto at = [&](int x, int y) { return static_cast<int>(field.texels[y * 26 + x]); };
+  const int row = 13;
+  EXPECT_NEAR(at(8, row), 128, 1);           // the half-covered column holds the outline
+  EXPECT_NEAR(at(4, row), 128 - 64, 1);      // four pixels out
+  EXPECT_NEAR(at(12, row), 128 + 64, 1);     // four pixels in
+  EXPECT_EQ(at(0, row), 0);                  // the spread's far end, clamped
+  EXPECT_NEAR(at(13, 13), 128 + 5 * 16, 1);  // five pixels from the right edge
+  // Every row through the square rises monotonically towards the middle.
+  for (int x = 1; x <= 13; ++x)
+    EXPECT_GE(at(x, row), at(x - 1, row));
 }
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include <map>
 #include <mutex>
 
+#include "distance_field.h"
 #include "platform/kit_files.h"
 
 namespace Vexel::internal {
@@ -211,18 +212,23 @@ const GlyphImage& FontFace::Image(std::uint32_t glyph) {
   auto found = images_.find(glyph);
   if (found != images_.end())
     return found->second;
+  // The outline's coverage at the raster size, turned into a distance field
+  // here: much faster than rendering the field from the outline directly.
   GlyphImage image;
   if (FT_Load_Glyph(ft_face_, glyph, FT_LOAD_NO_HINTING | FT_LOAD_NO_BITMAP) == 0 &&
-      FT_Render_Glyph(ft_face_->glyph, FT_RENDER_MODE_SDF) == 0) {
+      FT_Render_Glyph(ft_face_->glyph, FT_RENDER_MODE_NORMAL) == 0) {
     const FT_Bitmap& bitmap = ft_face_->glyph->bitmap;
-    const auto px = static_cast<float>(kRasterPixelsPerEm);
-    if (bitmap.width > 0 && bitmap.rows > 0 && bitmap.pitch > 0) {
-      image.slot = atlas_.Add(bitmap.buffer, static_cast<int>(bitmap.width),
-                              static_cast<int>(bitmap.rows), bitmap.pitch);
-      image.left = static_cast<float>(ft_face_->glyph->bitmap_left) / px;
-      image.top = static_cast<float>(ft_face_->glyph->bitmap_top) / px;
-      image.width = static_cast<float>(bitmap.width) / px;
-      image.height = static_cast<float>(bitmap.rows) / px;
+    if (bitmap.width > 0 && bitmap.rows > 0 && bitmap.pitch > 0 &&
+        bitmap.pixel_mode == FT_PIXEL_MODE_GRAY) {
+      const DistanceField field =
+          ComputeDistanceField(bitmap.buffer, static_cast<int>(bitmap.width),
+                               static_cast<int>(bitmap.rows), bitmap.pitch, kSpreadPixels);
+      image.slot = atlas_.Add(field.texels.data(), field.width, field.height, field.width);
+      const auto px = static_cast<float>(kRasterPixelsPerEm);
+      image.left = static_cast<float>(ft_face_->glyph->bitmap_left - kSpreadPixels) / px;
+      image.top = static_cast<float>(ft_face_->glyph->bitmap_top + kSpreadPixels) / px;
+      image.width = static_cast<float>(field.width) / px;
+      image.height = static_cast<float>(field.height) / px;
     }
   }
   return images_.emplace(glyph, image).first->second;

@@ -143,16 +143,19 @@ std::vector<std::pair<std::size_t, std::size_t>> BreakLines(const std::u32string
                                                             const std::vector<bool>& starts,
                                                             float extra, float max_width) {
   const std::size_t n = p.size();
+  // Running sums of advances and character (cluster) counts.
+  std::vector<float> advance_before(n + 1, 0.0f);
+  std::vector<int> clusters_before(n + 1, 0);
+  for (std::size_t i = 0; i < n; ++i) {
+    advance_before[i + 1] = advance_before[i] + advance[i];
+    clusters_before[i + 1] = clusters_before[i] + (starts[i] ? 1 : 0);
+  }
   auto width = [&](std::size_t from, std::size_t to) {
     while (to > from && IsWhiteSpace(p[to - 1]))
       --to;
-    float sum = 0.0f;
-    int clusters = 0;
-    for (std::size_t i = from; i < to; ++i) {
-      sum += advance[i];
-      clusters += starts[i] ? 1 : 0;
-    }
-    return sum + extra * static_cast<float>(std::max(clusters - 1, 0));
+    const int clusters = clusters_before[to] - clusters_before[from];
+    return advance_before[to] - advance_before[from] +
+           extra * static_cast<float>(std::max(clusters - 1, 0));
   };
   std::vector<std::pair<std::size_t, std::size_t>> lines;
   std::size_t line_start = 0;

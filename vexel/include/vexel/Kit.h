@@ -35,6 +35,9 @@ class ResourceManager {
 // Font, Text) use it. Objects made on a kit may outlive it: a kit can be
 // replaced by a new one before the renderer, scene and resources made on the
 // old one are destroyed.
+//
+// Every kit call comes from one thread (the render thread): the process's
+// one graphics context stays current on the thread that used it last.
 class Kit {
  public:
   // `assets` may be null (then only fonts by path or platform fonts load).

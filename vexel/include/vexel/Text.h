@@ -18,9 +18,10 @@ class Font;
 // Text units: one text unit is the font's em. Lines are stacked downwards
 // from the container's top edge; each line is broken at spaces and between
 // CJK characters so that it fits the container's width, and aligned within
-// it. An empty container (the default) breaks only at newlines and aligns
-// around x = 0, the first line's top at y = 0. Text is not clipped to the
-// container.
+// it. A container of zero width (the default rectangle is all zero) breaks
+// only at newlines and aligns around its left edge: left-aligned lines start
+// there, centred ones centre on it, right-aligned ones end there. Text is
+// not clipped to the container.
 //
 // Glyphs are drawn from signed distance fields, so text stays sharp at any
 // scale the node gives it. Drawn with alpha blending, without depth writes.
