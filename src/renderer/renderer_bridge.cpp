@@ -168,20 +168,26 @@ void SetTranslationLanguageFont(const char* language, const char* fontPath) {
 
 void RenderOneFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
                     const FrameArrays& arrays) {
-  const void* image_data = image != nullptr ? image->data : nullptr;
-  const int image_width = image != nullptr ? image->cols : 0;
-  const int image_height = image != nullptr ? image->rows : 0;
-  OCR_LOGI("Vexel: renderOneFrame image(%p %d %d) text(%d)", image_data, image_width, image_height,
+  OCR_LOGI("Vexel: renderOneFrame image(%p %d %d) text(%d)",
+           image != nullptr ? static_cast<const void*>(image->data) : nullptr,
+           image != nullptr ? image->cols : 0, image != nullptr ? image->rows : 0,
            static_cast<int>(textCount));
+  if (!UpdateFrame(image, textCount, readText, arrays))
+    return;
+  Guarded("Vexel: Caught exception in SceneHandler::RenderOneFrame.",
+          [] { SceneHandler::Instance()->RenderOneFrame(); });
+}
 
+bool UpdateFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
+                 const FrameArrays& arrays) {
   SceneHandler& handler = *SceneHandler::Instance();
   if (!handler.HasRenderer())
-    return;
+    return false;
 
-  if (image_data != nullptr) {
+  if (image != nullptr && image->data != nullptr) {
     Guarded("Vexel: Caught exception in SceneHandler::UpdateBackgroundImage.", [&] {
-      handler.UpdateBackgroundImage(BackgroundRgba(*image, s_background_scratch), image_width,
-                                    image_height);
+      handler.UpdateBackgroundImage(BackgroundRgba(*image, s_background_scratch), image->cols,
+                                    image->rows);
     });
   }
 
@@ -189,30 +195,29 @@ void RenderOneFrame(const cv::Mat* image, std::size_t textCount, const TextReade
     s_render_translate = false;
     Guarded("Vexel: Caught exception in SceneHandler::ClearAllTextObjects.",
             [&] { handler.ClearAllTextObjects(false); });
-  } else {
-    s_render_translate = true;
-    if (!HasAllRects(arrays, textCount)) {
-      OCR_LOGE(
-          "Vexel: renderOneFrame needs 5 values per text in patchRects and textRects; "
-          "missing rectangles are drawn empty.");
-    }
-    Guarded("Vexel: Caught exception in SceneHandler::UpdateTextObjectCache.",
-            [&] { handler.UpdateTextObjectCache(); });
-    const CameraView view = CurrentCameraView(handler);
-    for (std::size_t i = 0; i < textCount; ++i) {
-      std::optional<std::string> text = readText(i);
-      if (!text)
-        OCR_LOGE("Vexel: GetStringUTFChars failed.");
-      const TextRecord record =
-          text ? UnpackTextRecord(arrays, i, std::move(*text)) : UnreadableTextRecord();
-      DrawText(handler, i, record, view);
-    }
-    Guarded("Vexel: Caught exception clearing remaining text objects.",
-            [&] { handler.ClearTextObjects(static_cast<unsigned int>(textCount), false); });
+    return true;
   }
 
-  Guarded("Vexel: Caught exception in SceneHandler::RenderOneFrame.",
-          [&] { handler.RenderOneFrame(); });
+  s_render_translate = true;
+  if (!HasAllRects(arrays, textCount)) {
+    OCR_LOGE(
+        "Vexel: renderOneFrame needs 5 values per text in patchRects and textRects; "
+        "missing rectangles are drawn empty.");
+  }
+  Guarded("Vexel: Caught exception in SceneHandler::UpdateTextObjectCache.",
+          [&] { handler.UpdateTextObjectCache(); });
+  const CameraView view = CurrentCameraView(handler);
+  for (std::size_t i = 0; i < textCount; ++i) {
+    std::optional<std::string> text = readText(i);
+    if (!text)
+      OCR_LOGE("Vexel: GetStringUTFChars failed.");
+    const TextRecord record =
+        text ? UnpackTextRecord(arrays, i, std::move(*text)) : UnreadableTextRecord();
+    DrawText(handler, i, record, view);
+  }
+  Guarded("Vexel: Caught exception clearing remaining text objects.",
+          [&] { handler.ClearTextObjects(static_cast<unsigned int>(textCount), false); });
+  return true;
 }
 
 bool GetRenderTranslate() {

@@ -43,6 +43,10 @@ using TextReader = std::function<std::optional<std::string>(std::size_t index)>;
 // kept), `textCount` texts read through `readText` with the per-text arrays.
 void RenderOneFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
                     const FrameArrays& arrays);
+// RenderOneFrame without its log line and the draw: brings the scene up to
+// date with the frame. False when there is no renderer (nothing was done).
+bool UpdateFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
+                 const FrameArrays& arrays);
 
 bool GetRenderTranslate();
 
