@@ -2,15 +2,40 @@ package com.quenda.tessel.demo;
 
 import com.quenda.tessel.Constants;
 import java.io.File;
+import java.io.IOException;
+import java.util.List;
+import org.opencv.core.Core;
 
-/** Drives the engine the way a phone host does, on a bundled default input. */
+/**
+ * Drives the engine the way a phone host does, on a deterministic generated camera sequence
+ * (printed text lines under a known camera motion). Each demo step is its own class; pictures and
+ * reports go to the output directory (first argument, default "out").
+ */
 public final class DemoHost {
   private DemoHost() {}
 
-  public static void main(String[] args) {
+  public static void main(String[] args) throws IOException {
     File out = new File(args.length > 0 ? args[0] : "out");
-    out.mkdirs();
+    if (!out.isDirectory() && !out.mkdirs()) {
+      throw new IOException("cannot create " + out);
+    }
+    System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
     System.out.printf("engine constants: %d values per rectangle, min inpaint size %d%n",
         Constants.getValsPerRect(), Constants.getMinInpaintSize());
+
+    DemoSequence sequence = DemoSequence.createDefault();
+    System.out.printf(
+        "input: %d frames of %.0fx%.0f, %d text lines; pan, rotation and zoom with blurred frames%n",
+        sequence.frameCount(), sequence.frameSize().width, sequence.frameSize().height,
+        sequence.lines().size());
+
+    // The engine prints each frame's homography on standard output while tracking.
+    List<TrackingStep.FrameResult> tracking = new TrackingStep(sequence).run(out);
+    System.out.println();
+    System.out.println("tracking (coverage left, blur, frame accuracy against frame 0,");
+    System.out.println("          centre error against the true rectangles in pixels):");
+    TrackingStep.print(tracking, System.out);
+    System.out.printf(
+        "wrote %s and %s%n", new File(out, "tracking.png"), new File(out, "tracking.txt"));
   }
 }

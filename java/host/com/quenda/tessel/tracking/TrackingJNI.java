@@ -1,0 +1,50 @@
+package com.quenda.tessel.tracking;
+
+import com.quenda.tessel.NativeLibrary;
+
+/**
+ * Region tracking and frame measures of the engine.
+ *
+ * <p>Rectangles travel as flat arrays of five doubles each: centre x, centre y, width, height
+ * (pixels, x right, y down) and angle in degrees. Images are passed as the native address of an
+ * {@code org.opencv.core.Mat} ({@code getNativeObjAddr()}) that stays owned by the caller.
+ */
+public final class TrackingJNI {
+  static {
+    NativeLibrary.load();
+  }
+
+  private TrackingJNI() {}
+
+  /**
+   * Starts tracking the given rectangles on an RGB frame (8-bit, 3 channels). Width and height are
+   * truncated to whole pixels; a trailing partial rectangle is ignored.
+   *
+   * @return the tracker handle, or 0 when {@code matAddr} is 0
+   */
+  public static native long initializeTracker(long matAddr, double[] rects);
+
+  /**
+   * Tracks the rectangles into the next RGB frame.
+   *
+   * @return five values per rectangle; all zeros for a rectangle that was lost and for every
+   *     rectangle of a frame in which tracking failed or moved implausibly; null when the handle or
+   *     the address is 0
+   */
+  public static native double[] updateTracker(long handle, long matAddr);
+
+  /** Share of the initially tracked spread still covered after the last successful update. */
+  public static native double getCoverageLeft(long handle);
+
+  /** Destroys the tracker; the handle must not be used afterwards. */
+  public static native void releaseTracker(long handle);
+
+  /**
+   * Colour-histogram correlation of two RGBA frames (8-bit, 4 channels): 1.0 for identical
+   * red/green distributions, down to -1.0.
+   */
+  public static native double calculateFrameAccuracy(long firstMatAddr, long secondMatAddr);
+
+  /** Sharpness of an RGBA frame: standard deviation of its Laplacian (small when blurred). */
+  public static native double calculateBlur(long matAddr);
+}
