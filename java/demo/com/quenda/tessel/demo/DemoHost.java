@@ -5,6 +5,7 @@ import java.io.File;
 import java.io.IOException;
 import java.util.List;
 import org.opencv.core.Core;
+import org.opencv.core.Mat;
 
 /**
  * Drives the engine the way a phone host does, on a deterministic generated camera sequence
@@ -37,5 +38,13 @@ public final class DemoHost {
     TrackingStep.print(tracking, System.out);
     System.out.printf(
         "wrote %s and %s%n", new File(out, "tracking.png"), new File(out, "tracking.txt"));
+
+    // The first frame's rectangles stand for the OCR result to be erased.
+    Mat first = sequence.frame(0);
+    InpaintingDemo.Result inpainting = InpaintingDemo.run(first, sequence.truthRects(0), out);
+    first.release();
+    System.out.println();
+    InpaintingDemo.print(inpainting, System.out);
+    System.out.printf("wrote %s%n", inpainting.picture);
   }
 }
