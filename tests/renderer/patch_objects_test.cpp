@@ -145,28 +145,5 @@ TEST_F(PatchObjectsTest, DeleteDetachesAndDestroysObjectMaterialAndTexture) {
   EXPECT_EQ(rect.id, -1);
 }
 
-TEST_F(PatchObjectsTest, DeleteTextObjectRetiresItsSlot) {
-  SceneHandler& handler = Handler();
-  InpaintedTextObject object;
-  object.text = std::make_unique<Vexel::Text>();
-  object.slot_index = 4;
-  object.patch = handler.CreateInpaintedRectObject(1, nullptr, 2, 2);
-  handler.DeleteInpaintedTextObject(object);
-  EXPECT_EQ(object.text, nullptr);
-  EXPECT_EQ(object.patch.object, nullptr);
-  EXPECT_EQ(object.slot_index, 0xFFFFFFFFu);
-  EXPECT_EQ(LiveCount("Text"), 0);
-}
-
-TEST_F(PatchObjectsTest, SlotNodesAreAppendedUpToTheIndex) {
-  SceneHandler& handler = Handler();
-  handler.CreateInpaintedTextObjectNodes(0);
-  EXPECT_EQ(handler.GetTextNodes().size(), 1u);
-  handler.CreateInpaintedTextObjectNodes(1);
-  EXPECT_EQ(handler.GetTextNodes().size(), 2u);
-  handler.CreateInpaintedTextObjectNodes(1);
-  EXPECT_EQ(handler.GetTextNodes().size(), 2u);
-}
-
 }  // namespace
 }  // namespace ocr_ar

@@ -131,13 +131,6 @@ TEST_F(SceneHandlerTest, DestructionGoesChildrenFirstThenSceneRendererKit) {
   }
 }
 
-TEST_F(SceneHandlerTest, RenderOneFrameDrawsAllAndNothingElse) {
-  SceneHandler& handler = Handler();
-  vexel_recording::ClearJournal();
-  handler.RenderOneFrame();
-  EXPECT_EQ(vexel_recording::Journal(), std::vector<std::string>{"Kit.drawAll"});
-}
-
 TEST_F(SceneHandlerTest, WithoutSceneCameraAndClearingDoNothing) {
   SceneHandler& handler = *SceneHandler::Instance();
   ocr::log::ScopedCapture log;
