@@ -46,5 +46,15 @@ public final class DemoHost {
     System.out.println();
     InpaintingDemo.print(inpainting, System.out);
     System.out.printf("wrote %s%n", inpainting.picture);
+
+    // Every frame drawn with the translations over the erased lines.
+    TranslationStep.Summary translation =
+        new TranslationStep(sequence, tracking, inpainting).run(out);
+    for (Mat overlay : inpainting.overlays) {
+      overlay.release();
+    }
+    System.out.println();
+    TranslationStep.print(translation, System.out);
+    System.out.printf("wrote %s and %s%n", translation.still, translation.animation);
   }
 }
