@@ -41,8 +41,6 @@ public final class DemoSequence {
       Imgproc.FONT_HERSHEY_COMPLEX, Imgproc.FONT_HERSHEY_TRIPLEX};
   private static final Scalar[] INKS = {
       new Scalar(25, 25, 30), new Scalar(30, 45, 125), new Scalar(120, 25, 25)};
-  private static final String LETTERS =
-      "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789";
 
   private final Size frameSize;
   private final int frameCount;
@@ -175,8 +173,9 @@ public final class DemoSequence {
       int thickness = 1 + i % 3;
       // Hershey glyphs are about 30 px tall (baseline included) at scale 1.
       double scale = Math.max(0.35, slotH * 0.65 / 30.0) * (0.5 + 0.5 * random.nextDouble());
-      int targetWidth = (int) (viewW * (0.45 + 0.5 * random.nextDouble()));
-      String text = randomLine(random, font, scale, thickness, targetWidth);
+      String text = Translations.source(i);
+      double widthAtUnitScale = Imgproc.getTextSize(text, font, 1.0, thickness, null).width;
+      scale = Math.min(scale, viewW * 0.95 / widthAtUnitScale);
       int[] baseline = new int[1];
       Size size = Imgproc.getTextSize(text, font, scale, thickness, baseline);
       double left = left0 + random.nextDouble() * Math.max(1.0, viewW - size.width);
@@ -190,25 +189,6 @@ public final class DemoSequence {
               (int) size.height + baseline[0] + 2 * TEXT_PADDING)));
     }
     return paper;
-  }
-
-  private static String randomLine(
-      Random random, int font, double scale, int thickness, int targetWidth) {
-    StringBuilder line = new StringBuilder();
-    int[] baseline = new int[1];
-    while (true) {
-      StringBuilder word = new StringBuilder();
-      int length = 2 + random.nextInt(7);
-      for (int i = 0; i < length; ++i) {
-        word.append(LETTERS.charAt(random.nextInt(LETTERS.length())));
-      }
-      String candidate = line.length() == 0 ? word.toString() : line + " " + word;
-      if (line.length() > 0
-          && Imgproc.getTextSize(candidate, font, scale, thickness, baseline).width > targetWidth) {
-        return line.toString();
-      }
-      line = new StringBuilder(candidate);
-    }
   }
 
   private static void addNoise(Mat image, double sigma, long noiseSeed) {

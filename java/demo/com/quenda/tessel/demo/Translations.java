@@ -3,13 +3,27 @@ package com.quenda.tessel.demo;
 import java.util.List;
 
 /**
- * The demo's bundled translations, standing in for the host's machine translation. The generated
- * page prints random letter groups, so each printed line is given the translation of a fixed
- * sign-like sentence, by line index.
+ * The demo's bundled translations, standing in for the host's OCR and machine translation: the
+ * generated page prints the English sentences, line by line, and the demo draws their
+ * translations in their place.
  */
 final class Translations {
   /** The languages in the order the demo shows them; each switch picks that language's font. */
   static final List<String> LANGUAGES = List.of("ja", "zh-CHS", "de");
+
+  // The printed lines. The page is drawn with Hershey fonts, which have ASCII glyphs only.
+  private static final String[] SOURCE = {
+      "Opening hours: Monday to Friday 9-18",
+      "Please keep this door closed at all times",
+      "Emergency exit",
+      "Platform 3 - trains to the city centre",
+      "No smoking anywhere in the building",
+      "Tickets are sold at the counter",
+      "Fresh coffee and cake served daily until six",
+      "Lost property is on the second floor",
+      "Wet floor - please walk carefully",
+      "Press the button for assistance",
+  };
 
   // Per line: Japanese, simplified Chinese, German.
   private static final String[][] LINES = {
@@ -31,6 +45,11 @@ final class Translations {
   };
 
   private Translations() {}
+
+  /** The English text printed as line {@code line}. */
+  static String source(int line) {
+    return SOURCE[line % SOURCE.length];
+  }
 
   /** The translation of printed line {@code line} into {@code language}. */
   static String of(int line, String language) {
