@@ -28,6 +28,8 @@ class DirectoryAssetManagerTest {
       assertNull(assets.read("missing.txt"));
       assertNull(assets.read("../outside.txt"));
       assertNull(assets.read(directory.resolve("sub/a.txt").toString()));
+      assertThrows(IllegalArgumentException.class,
+          () -> new DirectoryAssetManager(directory.resolve("none").toString()));
     } finally {
       Files.deleteIfExists(directory.resolveSibling("outside.txt"));
     }
@@ -44,11 +46,5 @@ class DirectoryAssetManagerTest {
           () -> KitProbe.measureWithAssetFont(assets, "Absent.ttf", "x"));
       assertEquals("Vexel: font asset \"Absent.ttf\" not found", missing.getMessage());
     }
-  }
-
-  @Test
-  void aPathThatIsNoDirectoryIsRejected() {
-    assertThrows(IllegalArgumentException.class,
-        () -> new DirectoryAssetManager(directory.resolve("none").toString()));
   }
 }
