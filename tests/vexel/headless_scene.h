@@ -4,6 +4,7 @@
 
 #include <array>
 #include <cstdint>
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <vector>
@@ -36,19 +37,17 @@ inline bool Near(const Rgba& actual, const Rgba& expected, int tolerance = 3) {
   return true;
 }
 
-inline std::string Show(const Rgba& p) {
-  return "(" + std::to_string(p[0]) + ", " + std::to_string(p[1]) + ", " + std::to_string(p[2]) +
-         ", " + std::to_string(p[3]) + ")";
+inline ::testing::AssertionResult PixelNear(const Frame& frame, int x, int y,
+                                            const Rgba& expected) {
+  if (Near(frame.At(x, y), expected))
+    return ::testing::AssertionSuccess();
+  return ::testing::AssertionFailure()
+         << "pixel (" << x << ", " << y << ") is " << ::testing::PrintToString(frame.At(x, y))
+         << ", expected " << ::testing::PrintToString(expected);
 }
 
-#define EXPECT_PIXEL(frame, x, y, ...)                                                    \
-  do {                                                                                    \
-    const ::vexel_test::Rgba expected_pixel = __VA_ARGS__;                                \
-    const ::vexel_test::Rgba actual_pixel = (frame).At((x), (y));                         \
-    EXPECT_TRUE(::vexel_test::Near(actual_pixel, expected_pixel))                         \
-        << "pixel (" << (x) << ", " << (y) << ") is " << ::vexel_test::Show(actual_pixel) \
-        << ", expected " << ::vexel_test::Show(expected_pixel);                           \
-  } while (0)
+#define EXPECT_PIXEL(frame, x, y, ...) \
+  EXPECT_TRUE(::vexel_test::PixelNear((frame), (x), (y), __VA_ARGS__))
 
 // A kit drawing headless into an offscreen window of width x height pixels
 // (64 x 48 unless a test fixture asks for another size),
@@ -99,11 +98,9 @@ class HeadlessScene : public ::testing::Test {
   std::unique_ptr<Vexel::Texture> SolidTexture(
       const Rgba& color, int size = 2,
       Vexel::Texture::PixelFormat format = Vexel::Texture::PIXEL_FORMAT_RGBA8) {
-    std::vector<unsigned char> pixels;
-    for (int i = 0; i < size * size; ++i) {
-      for (int c = 0; c < 4; ++c)
-        pixels.push_back(static_cast<unsigned char>(color[c]));
-    }
+    std::vector<unsigned char> pixels(static_cast<std::size_t>(size) * size * 4);
+    for (std::size_t i = 0; i < pixels.size(); ++i)
+      pixels[i] = static_cast<unsigned char>(color[i % 4]);
     auto texture = std::make_unique<Vexel::Texture>(kit_->getResourceManager(), "Solid",
                                                     Vexel::Texture::TYPE_2D, false);
     texture->setImage(pixels.data(), size, size, format);

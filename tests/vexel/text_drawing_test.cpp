@@ -86,7 +86,8 @@ TEST_F(TextDrawing, LatinTextDrawsInsideItsBoundingBoxInItsColour) {
   ExpectInkWithin(ink, *text, box);
   // Stems 40 pixels to the em are several pixels wide: fully covered pixels
   // show the colour itself.
-  EXPECT_TRUE(Near(ink.brightest, {255, 128, 0, 255}, 4)) << Show(ink.brightest);
+  EXPECT_TRUE(Near(ink.brightest, {255, 128, 0, 255}, 4))
+      << ::testing::PrintToString(ink.brightest);
 }
 
 TEST_F(TextDrawing, CjkTextFromAPlatformCollectionDrawsAndItsReferenceCharacterSizesTheLine) {

@@ -14,15 +14,10 @@ std::shared_ptr<FontFace> Face(const char* file) {
   return FontFace::Load(file, Font::FILE_TYPE_SYSTEM, nullptr);
 }
 
-std::uint32_t GlyphOf(const FontFace& face, char32_t c) {
-  hb_codepoint_t glyph = 0;
-  hb_font_get_nominal_glyph(face.hb_font(), c, &glyph);
-  return glyph;
-}
-
 // The x of the first placed glyph for this character.
 float XOf(const TextLayout& layout, const FontFace& face, char32_t c) {
-  const std::uint32_t glyph = GlyphOf(face, c);
+  hb_codepoint_t glyph = 0;
+  hb_font_get_nominal_glyph(face.hb_font(), c, &glyph);
   for (const PlacedGlyph& placed : layout.glyphs) {
     if (placed.glyph == glyph)
       return placed.x;
@@ -66,7 +61,7 @@ TEST(UnicodeText, NormalizingComposesFoldsSpaceAndDropsControls) {
   EXPECT_EQ(NormalizeForDisplay(U" \n\t "), U"");
 }
 
-TEST_F(TextLayoutTest, LineBoxesStackDownFromTheContainerTop) {
+TEST_F(TextLayoutTest, LineBoxesStackDownFromTheContainerTopAndBoundsHoldAllInk) {
   const TextLayout empty = LayOut(U"");
   EXPECT_EQ(empty.line_count, 0u);
   EXPECT_TRUE(empty.glyphs.empty());
@@ -79,6 +74,11 @@ TEST_F(TextLayoutTest, LineBoxesStackDownFromTheContainerTop) {
   EXPECT_FLOAT_EQ(layout.bounds.bottom, -3.0f * line.height());
   EXPECT_FLOAT_EQ(layout.glyphs[0].y, -line.ascent);
   EXPECT_FLOAT_EQ(layout.glyphs[2].y, -line.ascent - line.height());
+
+  // A stack of combining marks rises far above the ascender.
+  const TextLayout marks = LayOut(U"a\u0301\u0301\u0301\u0301\u0301");
+  EXPECT_GT(marks.bounds.top, 0.0f);
+  EXPECT_FLOAT_EQ(marks.bounds.bottom, -line.height());
 }
 
 TEST_F(TextLayoutTest, ExtraSpaceGoesBetweenCharactersAndTrailingSpacesTakeNoRoom) {
@@ -99,8 +99,16 @@ TEST_F(TextLayoutTest, LinesBreakAtSpacesToFitTheContainerButNeverInsideAWord) {
   EXPECT_EQ(LayOut(U"one two three four", 0.0f).line_count, 1u);    // no width: no wrapping
 }
 
-TEST_F(TextLayoutTest, CjkBreaksBetweenCharactersButKeepsClosingPunctuationAttached) {
+TEST_F(TextLayoutTest, CjkLinesTakeTheReferenceBoxAndBreakBetweenCharactersNotBeforeClosers) {
   auto cjk = Face("NotoSansCJK-Regular.ttc");
+  // A reference character sizes the line from its glyph box: the fullwidth
+  // "a" is one em tall, its ascent the typographic ascender's share. A
+  // character the font lacks leaves the default.
+  const LineMetrics reference = cjk->ReferenceLineMetrics(0xFF41);
+  EXPECT_NEAR(reference.height(), 1.0f, 1e-4f);
+  EXPECT_NEAR(reference.ascent, 0.88f, 1e-3f);
+  EXPECT_FLOAT_EQ(latin_->ReferenceLineMetrics(0x4E2D).height(),
+                  latin_->DefaultLineMetrics().height());
   // Fullwidth characters are one em wide.
   EXPECT_EQ(LayOut(U"中文中文中文", 2.5f, 0.0f, Text::ALIGN_LEFT, cjk.get()).line_count, 3u);
   // "。" may not start a line: it stays with the character before it, which
@@ -150,24 +158,6 @@ TEST_F(TextLayoutTest, ArabicLettersJoin) {
   ASSERT_EQ(joined.glyphs.size(), 2u);
   EXPECT_NE(joined.glyphs[0].glyph, alone.glyphs[0].glyph);
   EXPECT_NE(joined.glyphs[1].glyph, alone.glyphs[0].glyph);
-}
-
-TEST_F(TextLayoutTest, BoundsHoldTheInkOfGlyphsThatLeaveTheLineBox) {
-  // A stack of combining marks rises far above the ascender.
-  const LineMetrics line = latin_->DefaultLineMetrics();
-  const TextLayout layout = LayOut(U"a\u0301\u0301\u0301\u0301\u0301");
-  EXPECT_GT(layout.bounds.top, 0.0f);
-  EXPECT_FLOAT_EQ(layout.bounds.bottom, -line.height());
-}
-
-TEST_F(TextLayoutTest, ReferenceCharacterSizesTheLineFromItsGlyphBox) {
-  auto cjk = Face("NotoSansCJK-Regular.ttc");
-  const LineMetrics reference = cjk->ReferenceLineMetrics(0xFF41);
-  EXPECT_NEAR(reference.height(), 1.0f, 1e-4f);
-  EXPECT_NEAR(reference.ascent, 0.88f, 1e-3f);  // the typographic ascender's share
-  // A character the font lacks leaves the default.
-  EXPECT_FLOAT_EQ(latin_->ReferenceLineMetrics(0x4E2D).height(),
-                  latin_->DefaultLineMetrics().height());
 }
 
 TEST(DistanceFieldTest, EncodesSignedPixelDistancesAroundTheOutline) {
