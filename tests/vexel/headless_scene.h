@@ -94,16 +94,13 @@ class HeadlessScene : public ::testing::Test {
     return Frame{width_, height_, platform::desktop::ReadFrame(window_)};
   }
 
-  // A size x size texture of one colour, its bytes given in `format`'s order.
-  std::unique_ptr<Vexel::Texture> SolidTexture(
-      const Rgba& color, int size = 2,
-      Vexel::Texture::PixelFormat format = Vexel::Texture::PIXEL_FORMAT_RGBA8) {
+  std::unique_ptr<Vexel::Texture> SolidTexture(const Rgba& color, int size = 2) {
     std::vector<unsigned char> pixels(static_cast<std::size_t>(size) * size * 4);
     for (std::size_t i = 0; i < pixels.size(); ++i)
       pixels[i] = static_cast<unsigned char>(color[i % 4]);
     auto texture = std::make_unique<Vexel::Texture>(kit_->getResourceManager(), "Solid",
                                                     Vexel::Texture::TYPE_2D, false);
-    texture->setImage(pixels.data(), size, size, format);
+    texture->setImage(pixels.data(), size, size, Vexel::Texture::PIXEL_FORMAT_RGBA8);
     return texture;
   }
 
