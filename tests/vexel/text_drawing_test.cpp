@@ -98,7 +98,7 @@ TEST_F(TextDrawing, CjkTextFromAPlatformCollectionDrawsAndItsReferenceCharacterS
 
   font.setReferenceCharacter(0xFF41);
   const Vexel::Rect box = text->getBoundingBox();
-  EXPECT_NEAR(box.height(), 1.0f, 0.02f);  // one em: the fullwidth character's box
+  EXPECT_NEAR(box.height(), 1.0f, 1e-4f);  // one em: the fullwidth character's box
   EXPECT_NEAR(box.width(), 4.0f, 0.02f);   // four fullwidth advances
 
   const Ink ink = FindInk(Draw());
