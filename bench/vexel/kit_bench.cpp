@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "platform/desktop.h"
+#include "scene_parts.h"
 #include "vexel/Vexel.h"
 
 namespace {
@@ -16,24 +17,6 @@ namespace {
 constexpr int kWidth = 1280;
 constexpr int kHeight = 720;
 constexpr int kItems = 20;
-
-constexpr const char* kQuadVertex =
-    "#version 100\n attribute vec4 position; attribute vec2 uv0; uniform mat4 worldViewProj; "
-    "varying vec2 oUv0; void main() { gl_Position = worldViewProj * position; oUv0 = uv0; }";
-constexpr const char* kQuadFragment =
-    "#version 100\n precision mediump int; precision mediump float; uniform sampler2D "
-    "diffuseMap; varying vec2 oUv0; void main() { gl_FragColor = texture2D(diffuseMap, oUv0); }";
-constexpr const char* kPatchVertex =
-    "#version 100\n attribute vec4 vertex; attribute vec2 uv0; uniform mat4 worldViewProj; "
-    "varying vec2 uv; void main(void) { uv = uv0; gl_Position = worldViewProj * vertex; }";
-constexpr const char* kPatchFragment =
-    "#version 100\n precision mediump float; precision mediump int; varying vec2 uv; uniform "
-    "sampler2D texture0; uniform vec3 colorScale; uniform vec3 colorShift; void main(void) { vec4 "
-    "col = texture2D(texture0, uv); gl_FragColor = vec4(col.rgb * colorScale + "
-    "vec3(colorShift/255.0), col.a); vec2 uvCentered = abs((uv * vec2(2.0, 2.0)) - vec2(1.0, "
-    "1.0)); float maxUVDist = max(uvCentered.x * uvCentered.x * uvCentered.x, uvCentered.y * "
-    "uvCentered.y); const float minAlpha = 0.8; gl_FragColor *= vec4(1, 1, 1, (1.0 - maxUVDist) "
-    "+ minAlpha); }";
 
 // 20 strings of 20 to 40 characters from a seeded generator.
 std::vector<std::string> Strings() {
@@ -64,22 +47,6 @@ std::vector<unsigned char> Image(int width, int height, unsigned seed) {
   return pixels;
 }
 
-std::unique_ptr<Vexel::Mesh> UnitQuad() {
-  auto mesh = std::make_unique<Vexel::Mesh>("InpaintedRectMesh");
-  mesh->begin(4, 4, Vexel::Mesh::RENDER_TRIANGLE_STRIP);
-  const float corners[4][4] = {
-      {0.5f, -0.5f, 1, 1}, {0.5f, 0.5f, 1, 0}, {-0.5f, -0.5f, 0, 1}, {-0.5f, 0.5f, 0, 0}};
-  for (const auto& c : corners) {
-    mesh->position(c[0], c[1], 0);
-    mesh->textureCoord(c[2], c[3]);
-  }
-  for (unsigned int i = 0; i < 4; ++i)
-    mesh->index(i);
-  mesh->end();
-  mesh->finalize();
-  return mesh;
-}
-
 // The renderer's scene: background quad, then per item a patch and its text.
 class OverlayScene {
  public:
@@ -91,7 +58,7 @@ class OverlayScene {
         scene_(std::make_unique<Vexel::Scene>(*kit_)),
         font_(std::make_unique<Vexel::Font>("NotoSansCJK-Regular.ttc",
                                             Vexel::Font::FILE_TYPE_SYSTEM, true)),
-        mesh_(UnitQuad()),
+        mesh_(vexel_test::UnitQuad("InpaintedRectMesh")),
         camera_image_(Image(kWidth, kHeight, 1)) {
     auto& resources = kit_->getResourceManager();
     camera_.setParent(scene_->getRootNode());
@@ -104,16 +71,7 @@ class OverlayScene {
                                                            Vexel::Texture::TYPE_2D, false);
     background_texture_->setImage(camera_image_.data(), kWidth, kHeight,
                                   Vexel::Texture::PIXEL_FORMAT_RGBA8);
-    background_material_ = std::make_unique<Vexel::Material>(resources);
-    background_material_->setShader(Vexel::Material::SHADER_VERTEX, "BackgroundImageVertShader",
-                                    kQuadVertex);
-    background_material_->setShader(Vexel::Material::SHADER_FRAGMENT, "BackgroundImageFragShader",
-                                    kQuadFragment);
-    background_material_->setShaderSampler(Vexel::Material::SHADER_FRAGMENT, "diffuseMap",
-                                           background_texture_.get());
-    background_material_->setShaderAutoUniform(
-        Vexel::Material::SHADER_VERTEX, "worldViewProj",
-        Vexel::Material::AUTO_UNIFORM_WORLD_VIEW_PROJECTION_MATRIX);
+    background_material_ = vexel_test::QuadMaterial(resources, background_texture_.get());
     background_ = std::make_unique<Vexel::Object>(*mesh_);
     background_->setMaterial(0, background_material_.get());
     background_->setScale(kWidth, kHeight, 1);
@@ -133,20 +91,8 @@ class OverlayScene {
           resources, ("InpaintedTexture" + std::to_string(i)).c_str(), Vexel::Texture::TYPE_2D,
           false);
       item.texture->setImage(patch.data(), 240, 40, Vexel::Texture::PIXEL_FORMAT_RGBA8);
-      item.material = std::make_unique<Vexel::Material>(resources);
-      item.material->setShader(Vexel::Material::SHADER_VERTEX, "InpaintedRectVertexShader",
-                               kPatchVertex);
-      item.material->setShader(Vexel::Material::SHADER_FRAGMENT, "InpaintedRectFragmentShader",
-                               kPatchFragment);
-      item.material->setShaderSampler(Vexel::Material::SHADER_FRAGMENT, "texture0",
-                                      item.texture.get());
-      item.material->setShaderAutoUniform(
-          Vexel::Material::SHADER_VERTEX, "worldViewProj",
-          Vexel::Material::AUTO_UNIFORM_WORLD_VIEW_PROJECTION_MATRIX);
-      item.material->setShaderUniform(Vexel::Material::SHADER_FRAGMENT, "colorScale",
-                                      Vexel::Vector3(1, 1, 1));
-      item.material->setShaderUniform(Vexel::Material::SHADER_FRAGMENT, "colorShift",
-                                      Vexel::Vector3(0, 0, 0));
+      item.material = vexel_test::PatchMaterial(resources, item.texture.get(),
+                                                Vexel::Vector3(1, 1, 1), Vexel::Vector3(0, 0, 0));
       item.material->setBlendMode(Vexel::Material::BLEND_ALPHA);
       item.material->setDepthWriteEnabled(false);
       item.patch = std::make_unique<Vexel::Object>(*mesh_);

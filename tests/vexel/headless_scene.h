@@ -4,34 +4,15 @@
 
 #include <array>
 #include <cstdint>
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "platform/desktop.h"
-#include "vexel/Vexel.h"
+#include "scene_parts.h"
 
 namespace vexel_test {
-
-// The renderer's two shader pairs: a plain textured quad and the inpainted
-// patch with colour correction and faded edges.
-inline constexpr const char* kQuadVertex =
-    "#version 100\n attribute vec4 position; attribute vec2 uv0; uniform mat4 worldViewProj; "
-    "varying vec2 oUv0; void main() { gl_Position = worldViewProj * position; oUv0 = uv0; }";
-inline constexpr const char* kQuadFragment =
-    "#version 100\n precision mediump int; precision mediump float; uniform sampler2D "
-    "diffuseMap; varying vec2 oUv0; void main() { gl_FragColor = texture2D(diffuseMap, oUv0); }";
-inline constexpr const char* kPatchVertex =
-    "#version 100\n attribute vec4 vertex; attribute vec2 uv0; uniform mat4 worldViewProj; "
-    "varying vec2 uv; void main(void) { uv = uv0; gl_Position = worldViewProj * vertex; }";
-inline constexpr const char* kPatchFragment =
-    "#version 100\n precision mediump float; precision mediump int; varying vec2 uv; uniform "
-    "sampler2D texture0; uniform vec3 colorScale; uniform vec3 colorShift; void main(void) { vec4 "
-    "col = texture2D(texture0, uv); gl_FragColor = vec4(col.rgb * colorScale + "
-    "vec3(colorShift/255.0), col.a); vec2 uvCentered = abs((uv * vec2(2.0, 2.0)) - vec2(1.0, "
-    "1.0)); float maxUVDist = max(uvCentered.x * uvCentered.x * uvCentered.x, uvCentered.y * "
-    "uvCentered.y); const float minAlpha = 0.8; gl_FragColor *= vec4(1, 1, 1, (1.0 - maxUVDist) "
-    "+ minAlpha); }";
 
 using Rgba = std::array<int, 4>;
 
@@ -56,19 +37,17 @@ inline bool Near(const Rgba& actual, const Rgba& expected, int tolerance = 3) {
   return true;
 }
 
-inline std::string Show(const Rgba& p) {
-  return "(" + std::to_string(p[0]) + ", " + std::to_string(p[1]) + ", " + std::to_string(p[2]) +
-         ", " + std::to_string(p[3]) + ")";
+inline ::testing::AssertionResult PixelNear(const Frame& frame, int x, int y,
+                                            const Rgba& expected) {
+  if (Near(frame.At(x, y), expected))
+    return ::testing::AssertionSuccess();
+  return ::testing::AssertionFailure()
+         << "pixel (" << x << ", " << y << ") is " << ::testing::PrintToString(frame.At(x, y))
+         << ", expected " << ::testing::PrintToString(expected);
 }
 
-#define EXPECT_PIXEL(frame, x, y, ...)                                                    \
-  do {                                                                                    \
-    const ::vexel_test::Rgba expected_pixel = __VA_ARGS__;                                \
-    const ::vexel_test::Rgba actual_pixel = (frame).At((x), (y));                         \
-    EXPECT_TRUE(::vexel_test::Near(actual_pixel, expected_pixel))                         \
-        << "pixel (" << (x) << ", " << (y) << ") is " << ::vexel_test::Show(actual_pixel) \
-        << ", expected " << ::vexel_test::Show(expected_pixel);                           \
-  } while (0)
+#define EXPECT_PIXEL(frame, x, y, ...) \
+  EXPECT_TRUE(::vexel_test::PixelNear((frame), (x), (y), __VA_ARGS__))
 
 // A kit drawing headless into an offscreen window of width x height pixels
 // (64 x 48 unless a test fixture asks for another size),
@@ -102,6 +81,7 @@ class HeadlessScene : public ::testing::Test {
   }
 
   void TearDown() override {
+    quad_mesh_.reset();
     camera_.reset();
     scene_.reset();
     renderer_.reset();
@@ -114,32 +94,10 @@ class HeadlessScene : public ::testing::Test {
     return Frame{width_, height_, platform::desktop::ReadFrame(window_)};
   }
 
-  // The unit quad centred on its node, v running down so that the first
-  // image row is at the top.
-  static std::unique_ptr<Vexel::Mesh> UnitQuad(const char* name = "UnitQuad") {
-    auto mesh = std::make_unique<Vexel::Mesh>(name);
-    mesh->begin(4, 4, Vexel::Mesh::RENDER_TRIANGLE_STRIP);
-    mesh->position(0.5f, -0.5f, 0.0f);
-    mesh->textureCoord(1.0f, 1.0f);
-    mesh->position(0.5f, 0.5f, 0.0f);
-    mesh->textureCoord(1.0f, 0.0f);
-    mesh->position(-0.5f, -0.5f, 0.0f);
-    mesh->textureCoord(0.0f, 1.0f);
-    mesh->position(-0.5f, 0.5f, 0.0f);
-    mesh->textureCoord(0.0f, 0.0f);
-    for (unsigned int i = 0; i < 4; ++i)
-      mesh->index(i);
-    mesh->end();
-    mesh->finalize();
-    return mesh;
-  }
-
   std::unique_ptr<Vexel::Texture> SolidTexture(const Rgba& color, int size = 2) {
-    std::vector<unsigned char> pixels;
-    for (int i = 0; i < size * size; ++i) {
-      for (int c = 0; c < 4; ++c)
-        pixels.push_back(static_cast<unsigned char>(color[c]));
-    }
+    std::vector<unsigned char> pixels(static_cast<std::size_t>(size) * size * 4);
+    for (std::size_t i = 0; i < pixels.size(); ++i)
+      pixels[i] = static_cast<unsigned char>(color[i % 4]);
     auto texture = std::make_unique<Vexel::Texture>(kit_->getResourceManager(), "Solid",
                                                     Vexel::Texture::TYPE_2D, false);
     texture->setImage(pixels.data(), size, size, Vexel::Texture::PIXEL_FORMAT_RGBA8);
@@ -147,13 +105,22 @@ class HeadlessScene : public ::testing::Test {
   }
 
   std::unique_ptr<Vexel::Material> QuadMaterial(Vexel::Texture* texture) {
-    auto material = std::make_unique<Vexel::Material>(kit_->getResourceManager());
-    material->setShader(Vexel::Material::SHADER_VERTEX, "QuadVertex", kQuadVertex);
-    material->setShader(Vexel::Material::SHADER_FRAGMENT, "QuadFragment", kQuadFragment);
-    material->setShaderSampler(Vexel::Material::SHADER_FRAGMENT, "diffuseMap", texture);
-    material->setShaderAutoUniform(Vexel::Material::SHADER_VERTEX, "worldViewProj",
-                                   Vexel::Material::AUTO_UNIFORM_WORLD_VIEW_PROJECTION_MATRIX);
-    return material;
+    return vexel_test::QuadMaterial(kit_->getResourceManager(), texture);
+  }
+
+  // A width x height quad drawn with `material`, centred on scene (x, y) at
+  // kDepth. The shared mesh is made on first use, so a test decides whether
+  // it exists before the renderer does.
+  std::unique_ptr<Vexel::Object> AddQuad(Vexel::Material* material, float width, float height,
+                                         float x = 0, float y = 0) {
+    if (!quad_mesh_)
+      quad_mesh_ = UnitQuad();
+    auto quad = std::make_unique<Vexel::Object>(*quad_mesh_);
+    quad->setMaterial(0, material);
+    quad->setScale(width, height, 1);
+    quad->setPosition(x, y, kDepth);
+    quad->setParent(scene_->getRootNode());
+    return quad;
   }
 
   const int width_;
@@ -163,6 +130,7 @@ class HeadlessScene : public ::testing::Test {
   std::unique_ptr<Vexel::AndroidSurfaceRenderer> renderer_;
   std::unique_ptr<Vexel::Scene> scene_;
   std::unique_ptr<Vexel::Camera> camera_;
+  std::unique_ptr<Vexel::Mesh> quad_mesh_;
 };
 
 }  // namespace vexel_test

@@ -1,6 +1,5 @@
 #include <gmock/gmock.h>
 
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 
@@ -46,12 +45,7 @@ TEST_F(KitErrors, ShaderThatDoesNotCompileNamesItselfAndCarriesTheInfoLog) {
   material.setShaderSampler(Material::SHADER_FRAGMENT, "diffuseMap", texture.get());
   material.setShaderAutoUniform(Material::SHADER_VERTEX, "worldViewProj",
                                 Material::AUTO_UNIFORM_WORLD_VIEW_PROJECTION_MATRIX);
-  auto mesh = UnitQuad();
-  Vexel::Object quad(*mesh);
-  quad.setMaterial(0, &material);
-  quad.setScale(8, 8, 1);
-  quad.setPosition(0, 0, kDepth);
-  quad.setParent(scene_->getRootNode());
+  auto quad = AddQuad(&material, 8, 8);
   EXPECT_PIXEL(Draw(), 32, 24, {0, 255, 255, 255});
 }
 
@@ -70,78 +64,54 @@ TEST_F(KitErrors, ShadersThatDoNotLinkNameBothStages) {
   EXPECT_THAT(message, HasSubstr("tint"));
 }
 
-TEST_F(KitErrors, MissingAndUnreadableFontsSayWhatWasLookedFor) {
-  EXPECT_EQ(FailureOf([] { Font("/nonexistent/Missing.ttf", Font::FILE_TYPE_PATH, true); }),
+TEST(KitFonts, FontsThatCannotBeLoadedSayWhatWasLookedFor) {
+  const auto failure = [](const std::string& name, Font::FileType type) {
+    return FailureOf([&] { Font(name, type, true); });
+  };
+  EXPECT_THAT(failure("Bundled.ttf", Font::FILE_TYPE_ASSET), HasSubstr("needs a live Vexel::Kit"));
+  Vexel::Kit kit(nullptr, "");
+  EXPECT_EQ(failure("/nonexistent/Missing.ttf", Font::FILE_TYPE_PATH),
             "Vexel: font \"/nonexistent/Missing.ttf\" not found: cannot open "
             "/nonexistent/Missing.ttf");
-  EXPECT_EQ(FailureOf([] { Font("NoSuchFont.ttf", Font::FILE_TYPE_SYSTEM, true); }),
+  EXPECT_EQ(failure("NoSuchFont.ttf", Font::FILE_TYPE_SYSTEM),
             "Vexel: platform font \"NoSuchFont.ttf\" not found in /usr/share/fonts and "
             "/usr/local/share/fonts");
-  EXPECT_EQ(FailureOf([] { Font("NotoSansCJK-Regular.ttc", Font::FILE_TYPE_ASSET, true); }),
+  EXPECT_EQ(failure("NotoSansCJK-Regular.ttc", Font::FILE_TYPE_ASSET),
             "Vexel: font \"NotoSansCJK-Regular.ttc\" is an asset, but the current kit has no "
             "asset manager");
 
   const std::filesystem::path junk = std::filesystem::temp_directory_path() / "vexel-junk.ttf";
   std::ofstream(junk) << "not a font at all";
-  EXPECT_THAT(FailureOf([&] { Font(junk.string(), Font::FILE_TYPE_PATH, true); }),
+  EXPECT_THAT(failure(junk.string(), Font::FILE_TYPE_PATH),
               HasSubstr("is not a readable font file"));
   std::filesystem::remove(junk);
-}
-
-TEST(KitFonts, AssetFontsAreReadThroughTheCurrentKitsAssetManager) {
-  const std::filesystem::path dir = std::filesystem::temp_directory_path() / "vexel-assets";
-  std::filesystem::create_directories(dir);
-  std::filesystem::copy_file("/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf", dir / "Bundled.ttf",
-                             std::filesystem::copy_options::overwrite_existing);
-  AAssetManager* assets = platform::desktop::CreateDirectoryAssetManager(dir.string());
-  {
-    EXPECT_THAT(FailureOf([] { Font("Bundled.ttf", Font::FILE_TYPE_ASSET, true); }),
-                HasSubstr("needs a live Vexel::Kit"));
-    Vexel::Kit kit(assets, "");
-    Font font("Bundled.ttf", Font::FILE_TYPE_ASSET, true);
-    EXPECT_EQ(font.getName(), "Bundled.ttf");
-    EXPECT_EQ(font.getFileType(), Font::FILE_TYPE_ASSET);
-    EXPECT_EQ(font.getReferenceCharacter(), 0u);
-    Vexel::Text text;
-    text.setFont(font);
-    text.setText("Asset");
-    EXPECT_GT(text.getBoundingBox().width(), 2.0f);
-    EXPECT_EQ(FailureOf([] { Font("Absent.ttf", Font::FILE_TYPE_ASSET, true); }),
-              "Vexel: font asset \"Absent.ttf\" not found");
-    EXPECT_EQ(FailureOf([] { Font("../Bundled.ttf", Font::FILE_TYPE_ASSET, true); }),
-              "Vexel: font asset \"../Bundled.ttf\" not found");
-  }
-  platform::desktop::DestroyDirectoryAssetManager(assets);
-  std::filesystem::remove_all(dir);
 }
 
 TEST_F(KitErrors, InconsistentMeshDefinitionsAreRejected) {
   Vexel::Mesh mesh("Bad");
   EXPECT_EQ(FailureOf([&] { mesh.end(); }), "Vexel: mesh \"Bad\": end() without begin()");
-  mesh.begin(3, 3, Vexel::Mesh::RENDER_TRIANGLES);
-  mesh.position(0, 0, 0);
-  mesh.position(1, 0, 0);
-  EXPECT_EQ(FailureOf([&] { mesh.end(); }), "Vexel: mesh \"Bad\": 2 positions for 3 vertices");
-  EXPECT_EQ(FailureOf([&] { mesh.finalize(); }),
-            "Vexel: mesh \"Bad\": finalize() before a complete definition");
-
-  mesh.begin(3, 3, Vexel::Mesh::RENDER_TRIANGLES);
-  for (int i = 0; i < 3; ++i)
-    mesh.position(static_cast<float>(i), 0, 0);
-  mesh.textureCoord(0, 0);
-  mesh.index(0);
-  mesh.index(1);
-  mesh.index(2);
-  EXPECT_EQ(FailureOf([&] { mesh.end(); }),
-            "Vexel: mesh \"Bad\": 1 texture coordinates for 3 vertices");
-
-  mesh.begin(3, 3, Vexel::Mesh::RENDER_TRIANGLES);
-  for (int i = 0; i < 3; ++i)
-    mesh.position(static_cast<float>(i), 0, 0);
-  mesh.index(0);
-  mesh.index(1);
-  mesh.index(3);
-  EXPECT_EQ(FailureOf([&] { mesh.end(); }), "Vexel: mesh \"Bad\": index 3 names no vertex");
+  const struct {
+    int positions;
+    int texture_coords;
+    std::vector<unsigned int> indices;
+    const char* message;
+  } cases[] = {
+      {2, 0, {}, "Vexel: mesh \"Bad\": 2 positions for 3 vertices"},
+      {3, 1, {0, 1, 2}, "Vexel: mesh \"Bad\": 1 texture coordinates for 3 vertices"},
+      {3, 0, {0, 1, 3}, "Vexel: mesh \"Bad\": index 3 names no vertex"},
+  };
+  for (const auto& c : cases) {
+    mesh.begin(3, 3, Vexel::Mesh::RENDER_TRIANGLES);
+    for (int i = 0; i < c.positions; ++i)
+      mesh.position(static_cast<float>(i), 0, 0);
+    for (int i = 0; i < c.texture_coords; ++i)
+      mesh.textureCoord(0, 0);
+    for (unsigned int index : c.indices)
+      mesh.index(index);
+    EXPECT_EQ(FailureOf([&] { mesh.end(); }), c.message);
+    EXPECT_EQ(FailureOf([&] { mesh.finalize(); }),
+              "Vexel: mesh \"Bad\": finalize() before a complete definition");
+  }
 }
 
 TEST_F(KitErrors, BadArgumentsThrowInsteadOfCorruptingState) {

@@ -19,35 +19,26 @@ class DirectoryAssetManagerTest {
   @TempDir Path directory;
 
   @Test
-  void readsFilesByRelativeNameAndNothingOutsideItsDirectory() throws IOException {
+  void servesFilesByRelativeNameToTheKitAndNothingOutsideItsDirectory() throws IOException {
     Files.createDirectories(directory.resolve("sub"));
     Files.write(directory.resolve("sub/a.txt"), "asset".getBytes(StandardCharsets.UTF_8));
     Files.write(directory.resolveSibling("outside.txt"), new byte[] {1});
+    Files.copy(Paths.get("/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf"),
+        directory.resolve("Bundled.ttf"));
     try (DirectoryAssetManager assets = new DirectoryAssetManager(directory.toString())) {
       assertArrayEquals("asset".getBytes(StandardCharsets.UTF_8), assets.read("sub/a.txt"));
       assertNull(assets.read("missing.txt"));
       assertNull(assets.read("../outside.txt"));
       assertNull(assets.read(directory.resolve("sub/a.txt").toString()));
-    } finally {
-      Files.deleteIfExists(directory.resolveSibling("outside.txt"));
-    }
-  }
 
-  @Test
-  void theKitLoadsFontAssetsThroughIt() throws IOException {
-    Files.copy(Paths.get("/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf"),
-        directory.resolve("Bundled.ttf"));
-    try (DirectoryAssetManager assets = new DirectoryAssetManager(directory.toString())) {
       float width = KitProbe.measureWithAssetFont(assets, "Bundled.ttf", "Hello");
       assertTrue(width > 2.0f && width < 4.0f, "width " + width);
       IllegalStateException missing = assertThrows(IllegalStateException.class,
           () -> KitProbe.measureWithAssetFont(assets, "Absent.ttf", "x"));
       assertEquals("Vexel: font asset \"Absent.ttf\" not found", missing.getMessage());
+    } finally {
+      Files.deleteIfExists(directory.resolveSibling("outside.txt"));
     }
-  }
-
-  @Test
-  void aPathThatIsNoDirectoryIsRejected() {
     assertThrows(IllegalArgumentException.class,
         () -> new DirectoryAssetManager(directory.resolve("none").toString()));
   }
