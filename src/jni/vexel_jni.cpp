@@ -9,6 +9,7 @@
 #include <string>
 
 #include "common/log.h"
+#include "common/modified_utf8.h"
 #include "jni/host_mat.h"
 #include "jni/jni_arrays.h"
 #include "renderer/renderer_bridge.h"
@@ -30,7 +31,7 @@ std::optional<std::string> ReadText(JNIEnv* env, jobjectArray texts, std::size_t
   {
     UtfChars chars(env, text);
     if (chars)
-      copy = chars.c_str();
+      copy = ocr::ModifiedUtf8ToUtf8(chars.c_str());
   }
   if (text != nullptr)
     env->DeleteLocalRef(text);
