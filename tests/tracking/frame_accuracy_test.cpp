@@ -32,9 +32,6 @@ TEST(FrameAccuracy, CorrelatesTheRedGreenHistogramsOnly) {
   const cv::Mat red(20, 30, CV_8UC4, cv::Scalar(200, 10, 40, 255));
   const cv::Mat green(40, 10, CV_8UC4, cv::Scalar(10, 200, 40, 255));
   EXPECT_NEAR(CalculateFrameAccuracy(red, green), -1.0 / 65535.0, 1e-12);
-  const double different = CalculateFrameAccuracy(RandomRgba(5), RandomRgba(6));
-  EXPECT_LT(different, 0.5);
-  EXPECT_GT(different, -1.0);
 }
 
 }  // namespace

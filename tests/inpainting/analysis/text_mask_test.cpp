@@ -217,6 +217,15 @@ TEST(GetBinaryImgNormalized, ArbiterTable) {
   }
 }
 
+TEST(GetBinaryImg, NormalisesThePolarityOfTheWholeMask) {
+  // CLAHE marks the bright background; compared with its inverse, the text wins.
+  const auto patch = ocr_testing::DrawTextPatch(PatchRecipe{});
+  cv::Mat dst = cv::Mat::zeros(patch.rgb.size(), CV_8UC1);
+  GetBinaryImg(patch.rgb, patch.TextPixels(), 0, 0, false, false, kMethodClahe, dst);
+  EXPECT_GT(CoveredShare(dst, patch.TextPixels()), 0.99);
+  EXPECT_EQ(CoveredShare(dst, patch.BackgroundPixels()), 0.0);
+}
+
 TEST(AnalysisConcurrency, ParallelWorkersMatchTheSerialRun) {
   std::vector<cv::Mat> patches;
   for (const PatchRecipe& recipe : ocr_testing::VariedRecipes(48, 11))

@@ -25,7 +25,6 @@ class TrackingJNITest {
   /** A wide region over texture: enough features to track the frame. */
   private static final double[] WIDE = {320, 160, 260, 50, 0};
 
-  private final List<Mat> mats = new ArrayList<>();
   private final List<Long> handles = new ArrayList<>();
 
   @BeforeAll
@@ -34,14 +33,8 @@ class TrackingJNITest {
   }
 
   @AfterEach
-  void releaseEverything() {
+  void releaseTrackers() {
     handles.forEach(TrackingJNI::releaseTracker);
-    mats.forEach(Mat::release);
-  }
-
-  private Mat keep(Mat mat) {
-    mats.add(mat);
-    return mat;
   }
 
   private long start(Mat frame, double[] rects) {
@@ -56,9 +49,9 @@ class TrackingJNITest {
   }
 
   /** 640 x 480 RGB frame of smoothed noise, with a flat grey band at the bottom. */
-  private Mat texturedFrame(int seed) {
+  private static Mat texturedFrame(int seed) {
     Core.setRNGSeed(seed);
-    Mat frame = keep(new Mat(480, 640, CvType.CV_8UC3));
+    Mat frame = new Mat(480, 640, CvType.CV_8UC3);
     Core.randu(frame, 0, 256);
     Imgproc.GaussianBlur(frame, frame, new Size(0, 0), 1.5);
     Core.normalize(frame, frame, 0, 255, Core.NORM_MINMAX);
@@ -119,12 +112,12 @@ class TrackingJNITest {
 
   @Test
   void frameAccuracyAndBlurReadTheHostsMats() {
-    Mat red = keep(new Mat(20, 30, CvType.CV_8UC4, new Scalar(200, 10, 40, 255)));
-    Mat green = keep(new Mat(20, 30, CvType.CV_8UC4, new Scalar(10, 200, 40, 255)));
+    Mat red = new Mat(20, 30, CvType.CV_8UC4, new Scalar(200, 10, 40, 255));
+    Mat green = new Mat(20, 30, CvType.CV_8UC4, new Scalar(10, 200, 40, 255));
     assertEquals(-1.0 / 65535.0,
         TrackingJNI.calculateFrameAccuracy(red.getNativeObjAddr(), green.getNativeObjAddr()),
         1e-12);
-    Mat dot = keep(new Mat(5, 5, CvType.CV_8UC4, new Scalar(0, 0, 0, 255)));
+    Mat dot = new Mat(5, 5, CvType.CV_8UC4, new Scalar(0, 0, 0, 255));
     dot.put(2, 2, 255, 255, 255, 255);
     assertEquals(Math.sqrt((1020.0 * 1020.0 + 4 * 255.0 * 255.0) / 25.0),
         TrackingJNI.calculateBlur(dot.getNativeObjAddr()), 1e-9);
