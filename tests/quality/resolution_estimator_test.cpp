@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <string>
 #include <vector>
 
@@ -9,6 +10,7 @@
 
 #include "common/log.h"
 #include "dead_leaves.h"
+#include "quality/resolution/radial_spectrum.h"
 
 namespace image_resolution {
 namespace {
@@ -103,6 +105,23 @@ TEST(ResolutionEstimator, MedianOfTheWindowsWithDetail) {
   EXPECT_DOUBLE_EQ(CombineWindowCutoffs({0, 0, 0, 0, 0, 0.3, 0.5, 0.7, 0.9}), 0.6);
   EXPECT_DOUBLE_EQ(CombineWindowCutoffs({0.9, 0.2, 0, 1, 0.4, 0, 0.3, 0, 0}), 0.4);
   EXPECT_DOUBLE_EQ(CombineWindowCutoffs({0, 0, 0, 0, 0, 0, 0, 0, 0}), kNoDetail);
+}
+
+// The noise floor constant rests on the profile's scale: white noise of
+// variance s² reads s² ln 2 in every ring (the median of an exponential
+// distribution). The end-to-end series do not see a scale error.
+TEST(ResolutionEstimator, WhiteNoiseReadsItsVarianceTimesLn2InEveryRing) {
+  const SpectrumPlan plan = MakeSpectrumPlan(240);
+  cv::Mat window(240, 240, CV_32F);
+  cv::RNG(1).fill(window, cv::RNG::NORMAL, 128.0, 10.0);
+  window.convertTo(window, CV_8U);
+  const std::vector<float> profile = RadialPowerProfile(window, plan);
+  ASSERT_EQ(profile.size(), 121u);
+  double log_sum = 0.0;
+  for (int bin = 10; bin <= plan.bins; ++bin)
+    log_sum += std::log(profile[bin]);
+  // Variance 100 plus the rounding's 1/12.
+  EXPECT_NEAR(std::exp(log_sum / (plan.bins - 9)), (100.0 + 1.0 / 12) * std::log(2.0), 5.0);
 }
 
 TEST(ResolutionEstimator, BadInputIsNotMeasuredAndSaysWhy) {
