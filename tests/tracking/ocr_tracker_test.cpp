@@ -166,6 +166,23 @@ TEST(OcrTrackerUpdate, TooFewTrackedPointsLatchTheFailureUntilTheNextStart) {
   EXPECT_LT(MaxDistance(out, started.corners), 0.05f);
 }
 
+TEST(OcrTrackerUpdate, FailedHomographyEndsTheUpdateWithoutLatching) {
+  StartedTracker started;
+  // Points on one line cannot give a homography.
+  Points line;
+  for (int i = 0; i < 40; ++i)
+    line.emplace_back(210.0f + 5.0f * static_cast<float>(i), 180.0f);
+  started.tracker.tracking_points_ = line;
+  started.tracker.min_tracked_points_ = 10;
+  ocr::log::ScopedCapture log;
+  Points out;
+  for (int update = 1; update <= 2; ++update) {
+    started.tracker.UpdateTracker(started.frame, &out);
+    EXPECT_EQ(log.Count("OcrTracker::UpdateTracker Failure: findHomography failed", kWarn), update);
+    EXPECT_TRUE(out.empty());
+  }
+}
+
 TEST(OcrTrackerUpdate, EmptySearchRegionIsAnOpenCvErrorNotAHang) {
   StartedTracker started;
   started.tracker.tracking_points_.assign(20, cv::Point2f(5000.0f, 5000.0f));

@@ -120,6 +120,15 @@ TEST(PartialImgDilation, KeepsTwoPixelBandsOutOfTheDilation) {
   }
 }
 
+TEST(FindMask, FillsOutlinesButLeavesHolesOpen) {
+  cv::Mat ring = cv::Mat::zeros(40, 40, CV_8UC1);
+  cv::circle(ring, {20, 20}, 15, cv::Scalar(255), 3);
+  cv::circle(ring, {20, 20}, 2, cv::Scalar(255), cv::FILLED);  // an island in the hole
+  cv::Mat filled = cv::Mat::zeros(40, 40, CV_8UC1);
+  EXPECT_EQ(FindMask(ring, &filled), 0);
+  EXPECT_EQ(cv::norm(filled, ring, cv::NORM_INF), 0);
+}
+
 // White boxes on a black mask.
 cv::Mat Boxes(cv::Size size, std::initializer_list<cv::Rect> boxes) {
   cv::Mat mask = cv::Mat::zeros(size, CV_8UC1);
