@@ -80,6 +80,15 @@ TEST(ForceColorContrast, MovesWeakTextTowardsTheTargetDampedByLightness) {
   }
 }
 
+TEST(RGBColorEnhance, ScalesUniformlySoTheFirstChannelAtOneLimitsAll) {
+  // The hue is kept: no channel outgrows the others.
+  cv::Scalar linear(0.9, 0.5, 0.1);
+  RGBColorEnhance(linear, 3.0);
+  EXPECT_DOUBLE_EQ(linear[0], 1.0);
+  EXPECT_DOUBLE_EQ(linear[1], 0.5 / 0.9);
+  EXPECT_DOUBLE_EQ(linear[2], 0.1 / 0.9);
+}
+
 TEST(GetWeightedMean, RefusesBadInputWithBlackAndItsOwnMessage) {
   const cv::Mat rgb(4, 4, CV_8UC3, cv::Scalar::all(50));
   const cv::Mat ones(4, 4, CV_8UC1, cv::Scalar(1));
