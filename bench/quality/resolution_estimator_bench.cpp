@@ -3,34 +3,19 @@
 // as the "estimate" counter beside each timing).
 #include <benchmark/benchmark.h>
 
-#include <algorithm>
 #include <cmath>
 
 #include <opencv2/core.hpp>
 #include <opencv2/imgproc.hpp>
 
+#include "dead_leaves.h"
 #include "quality/resolution/radial_spectrum.h"
 #include "quality/resolution/resolution_estimator.h"
 
 namespace {
 
-// Overlapping discs of random colour, radii distributed as r^-3, hard edges:
-// a natural-looking 1/f² spectrum with detail up to the pixel grid.
-cv::Mat DeadLeaves(cv::Size size, uint64_t seed) {
-  cv::RNG rng(seed);
-  cv::Mat image(size, CV_8UC4, cv::Scalar(128, 128, 128, 255));
-  const double inv_min2 = 1.0 / 4.0;
-  const double max_radius = std::min(size.width, size.height) / 8.0;
-  const double inv_max2 = 1.0 / (max_radius * max_radius);
-  for (int i = 0; i < size.area() / 30; ++i) {
-    const double radius = 1.0 / std::sqrt(inv_min2 - rng.uniform(0.0, 1.0) * (inv_min2 - inv_max2));
-    const cv::Point centre(rng.uniform(0, size.width), rng.uniform(0, size.height));
-    const cv::Scalar colour(rng.uniform(0, 256), rng.uniform(0, 256), rng.uniform(0, 256), 255);
-    cv::circle(image, centre, static_cast<int>(std::lround(radius)), colour, cv::FILLED,
-               cv::LINE_8);
-  }
-  return image;
-}
+using resolution_testing::DeadLeaves;
+using resolution_testing::Enlarged;
 
 const cv::Size kFrameSizes[] = {{1280, 720}, {1920, 1080}};
 
@@ -65,13 +50,8 @@ BENCHMARK(BM_RadialPowerProfile)->Arg(240)->Arg(256)->Unit(benchmark::kMicroseco
 // Shrunk by 2^range and enlarged back (bicubic, as a digital zoom).
 void BM_ScaleSeries(benchmark::State& state) {
   const cv::Mat sharp = DeadLeaves(kFrameSizes[0], 3);
-  cv::Mat frame = sharp;
   const double factor = std::pow(2.0, static_cast<double>(state.range(0)));
-  if (factor > 1.0) {
-    cv::Mat small;
-    cv::resize(sharp, small, cv::Size(), 1.0 / factor, 1.0 / factor, cv::INTER_AREA);
-    cv::resize(small, frame, sharp.size(), 0, 0, cv::INTER_CUBIC);
-  }
+  const cv::Mat frame = factor > 1.0 ? Enlarged(sharp, factor) : sharp;
   double estimate = 0.0;
   for (auto _ : state)
     benchmark::DoNotOptimize(estimate = image_resolution::EstimateResolution(&frame));

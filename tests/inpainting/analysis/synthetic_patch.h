@@ -46,12 +46,6 @@ SyntheticPatch DrawTextPatch(const PatchRecipe& recipe);
 // (luminance ratio at least 3).
 std::vector<PatchRecipe> VariedRecipes(int count, uint64_t seed);
 
-// Background of the given kind, without text.
-cv::Mat DrawBackground(const PatchRecipe& recipe);
-
-// Blends `color` over `background` with the 0..255 coverage as alpha.
-cv::Mat Compose(const cv::Mat& background, const cv::Mat& coverage, const cv::Scalar& color);
-
 // The pipeline's erase step as the colour measure sees it: cv::inpaint
 // (Telea, radius 3), at half resolution from 21 rows up.
 cv::Mat TeleaFill(const cv::Mat& patch, const cv::Mat& mask);

@@ -8,14 +8,9 @@
 
 namespace ocr_testing {
 
-cv::Mat SyntheticPatch::TextPixels() const {
-  return coverage >= 128;
-}
+namespace {
 
-cv::Mat SyntheticPatch::BackgroundPixels() const {
-  return coverage == 0;
-}
-
+// Background of the given kind, without text.
 cv::Mat DrawBackground(const PatchRecipe& recipe) {
   cv::Mat background(recipe.size, CV_8UC3, recipe.background_color);
   if (recipe.background == Background::kGradient) {
@@ -44,6 +39,7 @@ cv::Mat DrawBackground(const PatchRecipe& recipe) {
   return background;
 }
 
+// Blends `color` over `background` with the 0..255 coverage as alpha.
 cv::Mat Compose(const cv::Mat& background, const cv::Mat& coverage, const cv::Scalar& color) {
   cv::Mat alpha;
   coverage.convertTo(alpha, CV_32F, 1.0 / 255.0);
@@ -57,6 +53,29 @@ cv::Mat Compose(const cv::Mat& background, const cv::Mat& coverage, const cv::Sc
   cv::Mat out;
   blended.convertTo(out, CV_8UC3);
   return out;
+}
+
+double RelativeLuminance(const cv::Scalar& color) {
+  double linear[3];
+  for (int c = 0; c < 3; ++c) {
+    const double v = color[c] / 255.0;
+    linear[c] = v <= 0.03928 ? v / 12.92 : std::pow((v + 0.055) / 1.055, 2.4);
+  }
+  return 0.2126 * linear[0] + 0.7152 * linear[1] + 0.0722 * linear[2];
+}
+
+cv::Scalar RandomColor(cv::RNG& rng, int lo, int hi) {
+  return cv::Scalar(rng.uniform(lo, hi), rng.uniform(lo, hi), rng.uniform(lo, hi));
+}
+
+}  // namespace
+
+cv::Mat SyntheticPatch::TextPixels() const {
+  return coverage >= 128;
+}
+
+cv::Mat SyntheticPatch::BackgroundPixels() const {
+  return coverage == 0;
 }
 
 SyntheticPatch DrawTextPatch(const PatchRecipe& recipe) {
@@ -87,23 +106,6 @@ SyntheticPatch DrawTextPatch(const PatchRecipe& recipe) {
   patch.rgb = Compose(patch.background, patch.coverage, recipe.text_color);
   return patch;
 }
-
-namespace {
-
-double RelativeLuminance(const cv::Scalar& color) {
-  double linear[3];
-  for (int c = 0; c < 3; ++c) {
-    const double v = color[c] / 255.0;
-    linear[c] = v <= 0.03928 ? v / 12.92 : std::pow((v + 0.055) / 1.055, 2.4);
-  }
-  return 0.2126 * linear[0] + 0.7152 * linear[1] + 0.0722 * linear[2];
-}
-
-cv::Scalar RandomColor(cv::RNG& rng, int lo, int hi) {
-  return cv::Scalar(rng.uniform(lo, hi), rng.uniform(lo, hi), rng.uniform(lo, hi));
-}
-
-}  // namespace
 
 std::vector<PatchRecipe> VariedRecipes(int count, uint64_t seed) {
   static const int kFaces[] = {cv::FONT_HERSHEY_SIMPLEX, cv::FONT_HERSHEY_DUPLEX,

@@ -1,44 +1,51 @@
+// The text mask and its binarisation, and the whole analysis (mask and
+// colour) under concurrency.
 #include "inpainting/analysis/text_mask.h"
 
 #include <gtest/gtest.h>
 
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <tbb/parallel_for.h>
 #include <opencv2/core.hpp>
 #include <opencv2/imgproc.hpp>
 
 #include "common/log.h"
+#include "inpainting/analysis/binarization.h"
+#include "inpainting/analysis/center_crop.h"
+#include "inpainting/analysis/font_color.h"
 #include "inpainting/analysis/synthetic_patch.h"
 
 namespace {
 
 using namespace ocr_inpainting;
-using ocr::log::kError;
 using ocr::log::kInfo;
-using ocr::log::kWarn;
 using ocr_testing::Background;
 using ocr_testing::CoveredShare;
 using ocr_testing::PatchRecipe;
 
-struct Masks {
+struct Analysis {
+  int status = 0;
   cv::Mat mask, font_mask;
   int vertical_partition = -1;
-  int status = 0;
+  cv::Scalar color;
 };
 
-Masks RunGetMask(const cv::Mat& patch) {
-  Masks out;
-  out.status = GetMask(patch, out.mask, out.font_mask, out.vertical_partition);
-  return out;
+// Mask and colour of a patch; the fill is the true background when given,
+// else the pipeline's erase.
+Analysis Analyse(const cv::Mat& patch, const cv::Mat& background = cv::Mat()) {
+  Analysis a;
+  a.status = GetMask(patch, a.mask, a.font_mask, a.vertical_partition);
+  if (a.status == 0) {
+    const cv::Mat fill = background.empty() ? ocr_testing::TeleaFill(patch, a.mask) : background;
+    EXPECT_EQ(GetFontColor(patch, a.mask, fill, a.font_mask, a.color), 0);
+  }
+  return a;
 }
 
-// Background pixels more than 5 pixels from any text: beyond the edge mask
-// and the dilation.
-cv::Mat FarBackground(const ocr_testing::SyntheticPatch& patch) {
-  cv::Mat distance;
-  cv::distanceTransform(patch.coverage == 0, distance, cv::DIST_L2, cv::DIST_MASK_PRECISE);
-  return distance > 5;
-}
-
-TEST(GetMask, CoversTextNotBackgroundWithTextPolarityInBothMasks) {
+TEST(GetMask, CoversTextNotBackgroundAndFindsTheDrawnColour) {
   PatchRecipe dark, light, red, blue;
   light.text_color = {240, 240, 240};
   light.background_color = {30, 40, 50};
@@ -51,58 +58,39 @@ TEST(GetMask, CoversTextNotBackgroundWithTextPolarityInBothMasks) {
   blue.background_color2 = {8, 8, 8};
   for (const PatchRecipe& recipe : {dark, light, red, blue}) {
     const auto patch = ocr_testing::DrawTextPatch(recipe);
-    const Masks m = RunGetMask(patch.rgb);
-    ASSERT_EQ(m.status, 0);
-    EXPECT_EQ(CoveredShare(m.mask, patch.TextPixels()), 1.0) << recipe.text_color;
-    EXPECT_EQ(CoveredShare(m.mask, FarBackground(patch)), 0.0) << recipe.text_color;
+    const Analysis a = Analyse(patch.rgb, patch.background);
+    ASSERT_EQ(a.status, 0);
+    EXPECT_EQ(CoveredShare(a.mask, patch.TextPixels()), 1.0) << recipe.text_color;
+    // Background more than 5 px from any text: beyond the edges and the dilation.
+    cv::Mat distance;
+    cv::distanceTransform(patch.coverage == 0, distance, cv::DIST_L2, cv::DIST_MASK_PRECISE);
+    EXPECT_EQ(CoveredShare(a.mask, distance > 5), 0.0) << recipe.text_color;
     // The font mask holds the strokes, whichever way round the contrast is.
-    EXPECT_GT(CoveredShare(m.font_mask, patch.TextPixels()), 0.97) << recipe.text_color;
-    EXPECT_LT(CoveredShare(m.font_mask, patch.BackgroundPixels()), 0.01) << recipe.text_color;
+    EXPECT_GT(CoveredShare(a.font_mask, patch.TextPixels()), 0.97) << recipe.text_color;
+    EXPECT_LT(CoveredShare(a.font_mask, patch.BackgroundPixels()), 0.01) << recipe.text_color;
+    for (int c = 0; c < 3; ++c)
+      EXPECT_NEAR(a.color[c], recipe.text_color[c], 6.0) << recipe.text_color << " -> " << a.color;
   }
 }
 
-TEST(GetMask, TwoWordsSplitAtTheSecondWord) {
-  PatchRecipe recipe;
-  recipe.size = {240, 40};
-  recipe.lines = {"ab       cd"};
-  const auto patch = ocr_testing::DrawTextPatch(recipe);
-  const Masks m = RunGetMask(patch.rgb);
-  // The widest run of columns without ink lies between the words.
-  cv::Mat ink_columns;
-  cv::reduce(patch.coverage, ink_columns, 0, cv::REDUCE_MAX);
-  std::vector<cv::Point> ink;
-  cv::findNonZero(ink_columns, ink);
-  size_t widest = 0;
-  for (size_t i = 1; i + 1 < ink.size(); ++i) {
-    if (ink[i + 1].x - ink[i].x > ink[widest + 1].x - ink[widest].x)
-      widest = i;
-  }
-  EXPECT_GT(m.vertical_partition, ink[widest].x);
-  EXPECT_LE(m.vertical_partition, ink[widest + 1].x + 2);
-}
-
-TEST(GetMask, PatchesBelow4x4AreRefusedAndEmptyOnesDoNotCrash) {
+TEST(GetMask, PatchesBelow4x4AreRefusedAnd4x4IsNotDilated) {
   for (const cv::Size size : {cv::Size(3, 20), cv::Size(20, 3), cv::Size(0, 0)}) {
     ocr::log::ScopedCapture capture;
-    const Masks m = RunGetMask(cv::Mat(size, CV_8UC3, cv::Scalar::all(128)));
-    EXPECT_EQ(m.status, -1);
-    EXPECT_EQ(m.mask.size(), size);
-    EXPECT_EQ(cv::countNonZero(m.mask), 0);
-    EXPECT_EQ(m.vertical_partition, -1);
+    const Analysis a = Analyse(cv::Mat(size, CV_8UC3, cv::Scalar::all(128)));
+    EXPECT_EQ(a.status, -1);
+    EXPECT_EQ(a.mask.size(), size);
+    EXPECT_EQ(cv::countNonZero(a.mask), 0);
     EXPECT_TRUE(capture.Contains(
-        "Inpainting_Process: input image of GetInpaintingMask() is too small", kError));
+        "Inpainting_Process: input image of GetInpaintingMask() is too small", ocr::log::kError));
   }
-}
-
-TEST(GetMask, FourByFourGetsAMaskWithoutDilation) {
   cv::Mat patch(4, 4, CV_8UC3, cv::Scalar::all(230));
   patch(cv::Rect(1, 1, 2, 2)).setTo(cv::Scalar::all(20));
   ocr::log::ScopedCapture capture;
-  const Masks m = RunGetMask(patch);
-  EXPECT_EQ(m.status, 0);
-  EXPECT_EQ(m.mask.at<uchar>(1, 1), 255);
-  EXPECT_TRUE(capture.Contains("Inpainting_Process: No dilation needed for 4*4 image. ", kWarn));
-  EXPECT_TRUE(capture.Contains("Inpainting_Process: Keep the same contour mask ", kInfo));
+  const Analysis a = Analyse(patch);
+  EXPECT_EQ(a.status, 0);
+  EXPECT_EQ(a.mask.at<uchar>(1, 1), 255);
+  EXPECT_TRUE(
+      capture.Contains("Inpainting_Process: No dilation needed for 4*4 image. ", ocr::log::kWarn));
 }
 
 TEST(GetInpaintingMask, AllWhiteMaskGetsABlackFrame) {
@@ -115,29 +103,6 @@ TEST(GetInpaintingMask, AllWhiteMaskGetsABlackFrame) {
   EXPECT_TRUE(capture.Contains(" Inpainting: after dilate is all white...", kInfo));
   EXPECT_EQ(cv::countNonZero(mask), 28 * 28);
   EXPECT_EQ(cv::countNonZero(mask(cv::Rect(1, 1, 28, 28))), 28 * 28);
-}
-
-TEST(GetInpaintingMask, RegionOfALargerImageGivesTheSameMasksAsACopy) {
-  // The block path hands in regions of the block patch and its edge mask.
-  PatchRecipe recipe;
-  recipe.size = {200, 90};
-  recipe.lines = {"Menu", "Carte"};
-  recipe.background = Background::kTexture;
-  recipe.background_color2 = {6, 6, 6};
-  const auto block = ocr_testing::DrawTextPatch(recipe);
-  cv::Mat edges;
-  cv::morphologyEx(block.rgb, edges, cv::MORPH_GRADIENT, cv::Mat::ones(3, 3, CV_8U));
-  cv::cvtColor(edges, edges, cv::COLOR_RGB2GRAY);
-  edges = edges > 40;
-  const cv::Rect region(20, 8, 150, 40);
-  Masks view, copy;
-  GetInpaintingMask(block.rgb(region), edges(region), view.mask, view.font_mask,
-                    view.vertical_partition);
-  GetInpaintingMask(block.rgb(region).clone(), edges(region).clone(), copy.mask, copy.font_mask,
-                    copy.vertical_partition);
-  EXPECT_EQ(cv::norm(view.mask, copy.mask, cv::NORM_INF), 0);
-  EXPECT_EQ(cv::norm(view.font_mask, copy.font_mask, cv::NORM_INF), 0);
-  EXPECT_EQ(view.vertical_partition, copy.vertical_partition);
 }
 
 TEST(PartialImgDilation, KeepsTwoPixelBandsOutOfTheDilation) {
@@ -155,35 +120,139 @@ TEST(PartialImgDilation, KeepsTwoPixelBandsOutOfTheDilation) {
   }
 }
 
-TEST(FindMask, FillsOutlinesLeavesHolesOpenAndInputUntouched) {
+TEST(FindMask, FillsOutlinesButLeavesHolesOpen) {
   cv::Mat ring = cv::Mat::zeros(40, 40, CV_8UC1);
   cv::circle(ring, {20, 20}, 15, cv::Scalar(255), 3);
   cv::circle(ring, {20, 20}, 2, cv::Scalar(255), cv::FILLED);  // an island in the hole
-  const cv::Mat input = ring.clone();
   cv::Mat filled = cv::Mat::zeros(40, 40, CV_8UC1);
   EXPECT_EQ(FindMask(ring, &filled), 0);
-  EXPECT_EQ(cv::norm(ring, input, cv::NORM_INF), 0);
   EXPECT_EQ(cv::norm(filled, ring, cv::NORM_INF), 0);
-
-  ocr::log::ScopedCapture capture;
-  cv::Mat untouched(40, 40, CV_8UC1, cv::Scalar(7));
-  EXPECT_EQ(FindMask(cv::Mat::zeros(40, 40, CV_8UC1), &untouched), 0);
-  EXPECT_EQ(cv::countNonZero(untouched != 7), 0);
-  EXPECT_TRUE(capture.Contains("Inpainting: No contours found", kWarn));
 }
 
-TEST(GetContourMask, RisingEdgesAndThePartMask) {
-  cv::Mat grey = cv::Mat::zeros(40, 40, CV_8UC1);
-  grey(cv::Rect(10, 10, 20, 20)).setTo(200);
-  cv::Mat part_mask = cv::Mat::zeros(40, 40, CV_8UC1);
-  part_mask(cv::Rect(33, 33, 5, 5)).setTo(255);
-  cv::Mat contour_mask;
-  EXPECT_EQ(GetContourMask(grey, part_mask, contour_mask), 0);
-  EXPECT_EQ(contour_mask.at<uchar>(20, 10), 255);  // left side rises in +x
-  EXPECT_EQ(contour_mask.at<uchar>(10, 20), 255);  // top side rises in +y
-  EXPECT_EQ(contour_mask.at<uchar>(20, 20), 0);
-  EXPECT_EQ(contour_mask.at<uchar>(20, 30), 0);  // right side falls
-  EXPECT_EQ(cv::countNonZero(contour_mask(cv::Rect(33, 33, 5, 5))), 25);
+// White boxes on a black mask.
+cv::Mat Boxes(cv::Size size, std::initializer_list<cv::Rect> boxes) {
+  cv::Mat mask = cv::Mat::zeros(size, CV_8UC1);
+  for (const cv::Rect& box : boxes)
+    mask(box).setTo(255);
+  return mask;
+}
+
+TEST(Partitions, WordGapsLineBandsAndTheirInkTests) {
+  // A word gap must be wider than half the height, a band between lines
+  // higher than a fifth of it; each piece needs 10 % ink.
+  const cv::Size line(100, 20), block(100, 60);
+  const struct {
+    const char* name;
+    bool (*search)(const cv::Mat&, int*);
+    cv::Mat mask;
+    bool worth_using;
+    int split;
+  } cases[] = {
+      {"two words: split at the second", GetVerticalPartition,
+       Boxes(line, {{5, 5, 25, 10}, {60, 5, 35, 10}}), true, 61},
+      {"right piece under 10 % ink", GetVerticalPartition,
+       Boxes(line, {{5, 5, 40, 10}, {80, 5, 3, 10}}), false, 100},
+      {"left piece under 10 % ink", GetVerticalPartition,
+       Boxes(line, {{2, 5, 3, 10}, {20, 5, 75, 10}}), false, 0},
+      {"one word: unchanged", GetVerticalPartition, Boxes(line, {{5, 5, 90, 10}}), false, -7},
+      {"band between lines", GetHorizontalPartition,
+       Boxes(block, {{0, 5, 40, 15}, {0, 25, 100, 15}, {0, 45, 40, 10}}), true, 40},
+      {"bottom piece under 10 % ink", GetHorizontalPartition,
+       Boxes(block, {{0, 5, 40, 15}, {0, 25, 100, 15}, {0, 45, 10, 10}}), false, 60},
+  };
+  for (const auto& c : cases) {
+    int split = -7;
+    EXPECT_EQ(c.search(c.mask, &split), c.worth_using) << c.name;
+    EXPECT_EQ(split, c.split) << c.name;
+  }
+}
+
+TEST(Plausibility, CentreCropAndStrictBounds) {
+  EXPECT_EQ(CenterCropRange(20), cv::Range(2, 18));
+  EXPECT_EQ(CenterCropRange(5), cv::Range(0, 4));
+  EXPECT_EQ(CenterCropRange(1), cv::Range(0, 1));
+  cv::Mat mask = cv::Mat::zeros(10, 10, CV_8UC1);
+  for (const auto& [white, plausible] :
+       {std::pair{10, false}, std::pair{11, true}, std::pair{89, true}, std::pair{90, false}}) {
+    mask.setTo(0);
+    mask.reshape(1, 1).colRange(0, white).setTo(255);
+    EXPECT_EQ(ValidBinaryResultCheck(mask, 100), plausible) << white;
+  }
+}
+
+// A 30 x 30 mask whose centre crop (rows and columns 3..26) is `share`
+// white, filled from the top.
+cv::Mat MaskWithCentreShare(double share) {
+  cv::Mat mask = cv::Mat::zeros(30, 30, CV_8UC1);
+  mask(cv::Rect(3, 3, 24, static_cast<int>(24 * share))).setTo(255);
+  return mask;
+}
+
+TEST(GetBinaryImgNormalized, ArbiterTable) {
+  const cv::Mat plausible = MaskWithCentreShare(0.5), full = MaskWithCentreShare(1.0);
+  const cv::Mat empty = cv::Mat::zeros(30, 30, CV_8UC1), short_ref = plausible.rowRange(0, 20);
+  // A white ref inside a black frame: eroded in place, its top row and left
+  // column would darken and break the tie between the two halves.
+  cv::Mat framed = cv::Mat::zeros(32, 32, CV_8UC1), left = empty.clone();
+  framed(cv::Rect(1, 1, 30, 30)).setTo(255);
+  left.colRange(0, 15).setTo(255);
+  const struct {
+    cv::Mat ref, mask, candidate;
+    int mask_check, candidate_check;
+    bool replaced;
+  } cases[] = {
+      {plausible, full, plausible, 0, 1, true},
+      {plausible, full, empty, 0, 0, false},
+      {plausible, plausible, full, 1, 0, false},
+      // Both plausible: the one closer to the eroded ref wins, a tie keeps...
+      {plausible, plausible, 255 - plausible, 1, 1, false},
+      {plausible, 255 - plausible, plausible, 1, 1, true},
+      {plausible, plausible, plausible.clone(), 1, 1, false},
+      {framed(cv::Rect(1, 1, 30, 30)), left, 255 - left, 1, 1, false},
+      // ...but below 21 rows the mask is kept without comparing.
+      {short_ref, 255 - short_ref, short_ref, 1, 1, false},
+  };
+  for (const auto& c : cases) {
+    const std::string checks = "INPAINT_TAG: font_mask_check: " + std::to_string(c.mask_check) +
+                               ", bw_candidate_check: " + std::to_string(c.candidate_check) + " .";
+    ocr::log::ScopedCapture capture;
+    cv::Mat mask = c.mask.clone();
+    GetBinaryImgNormalized(c.ref, c.candidate, mask);
+    EXPECT_EQ(cv::norm(mask, c.replaced ? c.candidate : c.mask, cv::NORM_INF), 0) << checks;
+    EXPECT_TRUE(capture.Contains(checks, kInfo));
+    EXPECT_EQ(capture.Contains("Inpainting_Process: use default font_mask", kInfo),
+              c.candidate_check == 0)
+        << checks;
+  }
+}
+
+TEST(GetBinaryImg, NormalisesThePolarityOfTheWholeMask) {
+  // CLAHE marks the bright background; compared with its inverse, the text wins.
+  const auto patch = ocr_testing::DrawTextPatch(PatchRecipe{});
+  cv::Mat dst = cv::Mat::zeros(patch.rgb.size(), CV_8UC1);
+  GetBinaryImg(patch.rgb, patch.TextPixels(), 0, 0, false, false, kMethodClahe, dst);
+  EXPECT_GT(CoveredShare(dst, patch.TextPixels()), 0.99);
+  EXPECT_EQ(CoveredShare(dst, patch.BackgroundPixels()), 0.0);
+}
+
+TEST(AnalysisConcurrency, ParallelWorkersMatchTheSerialRun) {
+  std::vector<cv::Mat> patches;
+  for (const PatchRecipe& recipe : ocr_testing::VariedRecipes(48, 11))
+    patches.push_back(ocr_testing::DrawTextPatch(recipe).rgb);
+  std::vector<Analysis> serial;
+  for (const cv::Mat& patch : patches)
+    serial.push_back(Analyse(patch));
+  // Each patch twice, so that workers run the same inputs at the same time.
+  std::vector<Analysis> parallel(2 * patches.size());
+  tbb::parallel_for(size_t{0}, parallel.size(),
+                    [&](size_t i) { parallel[i] = Analyse(patches[i % patches.size()]); });
+  for (size_t i = 0; i < parallel.size(); ++i) {
+    const Analysis& expected = serial[i % patches.size()];
+    EXPECT_EQ(cv::norm(parallel[i].mask, expected.mask, cv::NORM_INF), 0) << i;
+    EXPECT_EQ(cv::norm(parallel[i].font_mask, expected.font_mask, cv::NORM_INF), 0) << i;
+    EXPECT_EQ(parallel[i].vertical_partition, expected.vertical_partition) << i;
+    EXPECT_EQ(parallel[i].color, expected.color) << i;
+  }
 }
 
 }  // namespace
