@@ -6,8 +6,8 @@
 
 #include <opencv2/core.hpp>
 
-// Synthetic camera frames with text lines, for the inpainting tests and the
-// quality evaluation: the clean background and every line's colour are known.
+// Synthetic camera frames with text lines, for the inpainting benchmarks and
+// the quality evaluation: the clean background and every line's colour are known.
 namespace ocr_testing {
 
 enum class Background { kGradient, kTexture, kPhoto };
