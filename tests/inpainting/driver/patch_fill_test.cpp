@@ -9,6 +9,7 @@
 #include <opencv2/imgproc.hpp>
 
 #include "common/log.h"
+#include "inpainting/driver/font_color_columns.h"
 
 namespace ocr_inpainting {
 namespace {
@@ -111,3 +112,15 @@ TEST(InpaintingThreshold, FillsAtFullSizeBelow21RowsAndAtHalfSizeFrom21) {
 
 }  // namespace
 }  // namespace ocr_inpainting
+
+TEST(FontColorColumns, PartitionPicksTheTextSideOfThePatch) {
+  // 40 columns: a split in the right half keeps the left piece, one in the
+  // left half the right piece, anything outside the patch all columns.
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(30, 40), cv::Range(0, 30));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(20, 40), cv::Range(0, 20));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(19, 40), cv::Range(19, 40));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(5, 40), cv::Range(5, 40));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(0, 40), cv::Range(0, 40));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(-1, 40), cv::Range(0, 40));
+  EXPECT_EQ(ocr_inpainting::FontColorColumns(40, 40), cv::Range(0, 40));
+}
