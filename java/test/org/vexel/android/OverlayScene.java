@@ -1,8 +1,7 @@
 package org.vexel.android;
 
 import com.quenda.tessel.testing.OpenCvHost;
-import java.util.ArrayList;
-import java.util.List;
+import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.MatOfPoint;
@@ -15,8 +14,8 @@ import org.vexel.desktop.DirectoryAssetManager;
 import org.vexel.desktop.OffscreenSurface;
 
 /**
- * The renderer on an offscreen surface as a phone host drives it, with frames built from one
- * camera image and one translated text, and the drawn pixels read back.
+ * The renderer on an offscreen surface as a phone host drives it, frames of one camera image and
+ * one translated text, and the drawn pixels read back as RGBA matrices and masks of them.
  */
 final class OverlayScene implements AutoCloseable {
   static final Scalar BACKGROUND = new Scalar(40, 90, 160, 255);
@@ -26,135 +25,89 @@ final class OverlayScene implements AutoCloseable {
   static final int TEXT_COLOR = 0xFF0000FF; // opaque red, 0xAABBGGRR
 
   final OffscreenSurface surface;
-  private final List<Mat> mats = new ArrayList<>();
+  // The default fonts the build assembled.
+  private final DirectoryAssetManager assets =
+      new DirectoryAssetManager(System.getProperty("ocr.assets"));
 
-  /** The asset directory the build assembled (default fonts). */
-  static DirectoryAssetManager assets() {
-    String directory = System.getProperty("ocr.assets");
-    if (directory == null || directory.isEmpty()) {
-      throw new IllegalStateException("ocr.assets is not set; run the test through ctest");
-    }
-    return new DirectoryAssetManager(directory);
-  }
-
-  OverlayScene(int width, int height) {
+  /** Initialises the renderer on a new surface for camera images of the given size. */
+  OverlayScene(int width, int height, int imageWidth, int imageHeight) {
     OpenCvHost.load();
     surface = new OffscreenSurface(width, height);
+    VexelJNI.setAssetManager(assets);
+    if (!VexelJNI.initFromSurface(surface, imageWidth, imageHeight)) {
+      throw new IllegalStateException("initFromSurface failed");
+    }
   }
 
-  Mat mat(Mat mat) {
-    mats.add(mat);
-    return mat;
-  }
-
-  /** A camera image of the background colour with the marker painted over {@code rect}. */
-  Mat imageWithMarker(int width, int height, RotatedRect rect) {
-    Mat image = mat(new Mat(height, width, CvType.CV_8UC4, BACKGROUND));
-    // Two pixels inside the rectangle, so that only the patch's own edge can matter.
-    RotatedRect inner = new RotatedRect(
-        rect.center, new Size(rect.size.width - 4, rect.size.height - 4), rect.angle);
+  /** A camera image of the background colour with the marker two pixels inside {@code rect}. */
+  static Mat imageWithMarker(int width, int height, RotatedRect rect) {
+    Mat image = new Mat(height, width, CvType.CV_8UC4, BACKGROUND);
     Point[] corners = new Point[4];
-    inner.points(corners);
+    new RotatedRect(rect.center, new Size(rect.size.width - 4, rect.size.height - 4), rect.angle)
+        .points(corners);
     Imgproc.fillConvexPoly(image, new MatOfPoint(corners), MARKER);
     return image;
   }
 
-  /** An upright RGBA patch of the rectangle's size in the patch colour. */
-  Mat patch(RotatedRect rect) {
-    return mat(new Mat((int) Math.round(rect.size.height), (int) Math.round(rect.size.width),
-        CvType.CV_8UC4, PATCH));
+  /** One frame with {@code text} in {@code rect} over an upright patch of the rectangle's size. */
+  static void renderText(Mat image, String text, RotatedRect rect) {
+    Mat patch = new Mat((int) Math.round(rect.size.height), (int) Math.round(rect.size.width),
+        CvType.CV_8UC4, PATCH);
+    double[] values = {rect.center.x, rect.center.y, rect.size.width, rect.size.height, rect.angle};
+    VexelJNI.renderOneFrame(image.getNativeObjAddr(), new String[] {text}, values, values,
+        new long[] {1}, new long[] {patch.getNativeObjAddr()}, new double[] {1, 1, 1},
+        new double[] {0, 0, 0}, new int[] {TEXT_COLOR});
   }
 
-  static double[] values(RotatedRect rect) {
-    return new double[] {
-        rect.center.x, rect.center.y, rect.size.width, rect.size.height, rect.angle};
-  }
-
-  /** One frame with one text and its patch, colour uncorrected. */
-  void renderText(Mat image, String text, RotatedRect rect, long id) {
-    Mat patch = patch(rect);
-    VexelJNI.renderOneFrame(image.getNativeObjAddr(), new String[] {text}, values(rect),
-        values(rect), new long[] {id}, new long[] {patch.getNativeObjAddr()},
-        new double[] {1, 1, 1}, new double[] {0, 0, 0}, new int[] {TEXT_COLOR});
-  }
-
-  void renderEmpty(Mat image) {
+  static void renderEmpty(Mat image) {
     VexelJNI.renderOneFrame(
         image.getNativeObjAddr(), new String[0], null, null, null, null, null, null, null);
   }
 
-  Pixels pixels() {
-    return new Pixels(surface.readPixels(), surface.getWidth(), surface.getHeight());
+  /** The last frame drawn, RGBA, top row first. */
+  Mat pixels() {
+    Mat frame = new Mat(surface.getHeight(), surface.getWidth(), CvType.CV_8UC4);
+    frame.put(0, 0, surface.readPixels());
+    return frame;
+  }
+
+  /** 255 where every channel of {@code frame} lies in [low, high]. */
+  static Mat inRange(Mat frame, Scalar low, Scalar high) {
+    Mat mask = new Mat();
+    Core.inRange(frame, low, high, mask);
+    return mask;
+  }
+
+  /** 255 where the colour lies within {@code tolerance} of {@code colour}, alpha aside. */
+  static Mat near(Mat frame, Scalar colour, int tolerance) {
+    double[] c = colour.val;
+    return inRange(frame, new Scalar(c[0] - tolerance, c[1] - tolerance, c[2] - tolerance, 0),
+        new Scalar(c[0] + tolerance, c[1] + tolerance, c[2] + tolerance, 255));
+  }
+
+  static Mat marker(Mat frame) {
+    return inRange(frame, new Scalar(0, 151, 0, 0), new Scalar(99, 255, 119, 255));
+  }
+
+  static Mat red(Mat frame) {
+    return inRange(frame, new Scalar(181, 0, 0, 0), new Scalar(255, 79, 79, 255));
+  }
+
+  /** Pixels of {@code mask} outside {@code region} grown by {@code margin} in every direction. */
+  static int outside(Mat mask, Mat region, int margin) {
+    Mat grown = new Mat();
+    Imgproc.dilate(region, grown,
+        Imgproc.getStructuringElement(
+            Imgproc.MORPH_RECT, new Size(2 * margin + 1, 2 * margin + 1)));
+    Core.subtract(mask, grown, grown);
+    return Core.countNonZero(grown);
   }
 
   @Override
   public void close() {
-    for (Mat mat : mats) {
-      mat.release();
-    }
+    VexelJNI.setOrientation(0); // the orientation outlives the renderer
+    VexelJNI.shutDown();
     surface.close();
-  }
-
-  /** A frame read back from the surface: RGBA, top row first. */
-  static final class Pixels {
-    final byte[] rgba;
-    final int width;
-    final int height;
-
-    Pixels(byte[] rgba, int width, int height) {
-      this.rgba = rgba;
-      this.width = width;
-      this.height = height;
-    }
-
-    int channel(int x, int y, int c) {
-      return rgba[(y * width + x) * 4 + c] & 0xFF;
-    }
-
-    boolean near(int x, int y, Scalar colour, int tolerance) {
-      for (int c = 0; c < 3; ++c) {
-        if (Math.abs(channel(x, y, c) - colour.val[c]) > tolerance) {
-          return false;
-        }
-      }
-      return true;
-    }
-
-    boolean isMarker(int x, int y) {
-      return channel(x, y, 1) > 150 && channel(x, y, 0) < 100 && channel(x, y, 2) < 120;
-    }
-
-    boolean isRed(int x, int y) {
-      return channel(x, y, 0) > 180 && channel(x, y, 1) < 80 && channel(x, y, 2) < 80;
-    }
-
-    /** A mask (CV_8U, 255 where the test holds) of this frame. */
-    Mat mask(java.util.function.BiPredicate<Integer, Integer> test) {
-      Mat mask = Mat.zeros(height, width, CvType.CV_8U);
-      byte[] row = new byte[width];
-      for (int y = 0; y < height; ++y) {
-        for (int x = 0; x < width; ++x) {
-          row[x] = (byte) (test.test(x, y) ? 255 : 0);
-        }
-        mask.put(y, 0, row);
-      }
-      return mask;
-    }
-  }
-
-  /** {@code mask} grown by {@code pixels} in every direction. */
-  static Mat grown(Mat mask, int pixels) {
-    Mat out = new Mat();
-    Imgproc.dilate(mask, out,
-        Imgproc.getStructuringElement(
-            Imgproc.MORPH_RECT, new Size(2 * pixels + 1, 2 * pixels + 1)));
-    return out;
-  }
-
-  /** The bytes of a CV_8U mask, row by row. */
-  static byte[] bytes(Mat mask) {
-    byte[] values = new byte[(int) mask.total()];
-    mask.get(0, 0, values);
-    return values;
+    assets.close();
   }
 }
