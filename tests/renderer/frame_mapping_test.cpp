@@ -11,7 +11,6 @@
 #include "renderer/color_correction.h"
 #include "renderer/frame_records.h"
 #include "renderer/rect_mapping.h"
-#include "renderer/vexel_utils.h"
 
 namespace ocr_ar {
 namespace {
@@ -41,15 +40,6 @@ TEST(ColorCorrection, ScalesShiftsClampsAndTruncatesKeepingAlpha) {
   }
 }
 
-TEST(MatPointer, YieldsDataColumnsAndRowsAndNothingForAddressZero) {
-  const cv::Mat mat(6, 8, CV_8UC4);
-  int width = -1, height = -1;
-  EXPECT_EQ(vexel_utils::GetOpenCVMatDataPointer(AddressOf(mat), &width, &height), mat.data);
-  EXPECT_EQ(std::make_pair(width, height), std::make_pair(8, 6));
-  EXPECT_EQ(vexel_utils::GetOpenCVMatDataPointer(0, &width, &height), nullptr);
-  EXPECT_EQ(std::make_pair(width, height), std::make_pair(0, 0));
-}
-
 // The arrays of a two-text frame.
 struct TwoTexts {
   std::vector<double> patch_rects{1, 2, 3, 4, 5, 11, 12, 13, 14, 15};
@@ -77,30 +67,28 @@ TEST(UnpackTextRecord, ReadsEachArrayAtTheTextsOffset) {
   const TwoTexts frame;
   const TextRecord r = UnpackTextRecord(frame.Arrays(), 1, "zwei");
   EXPECT_EQ(r.text, "zwei");
-  EXPECT_DOUBLE_EQ(r.patch_rect.center_x, 11);
-  EXPECT_DOUBLE_EQ(r.patch_rect.angle, 15);
-  EXPECT_DOUBLE_EQ(r.text_rect.center_y, 32);
-  EXPECT_DOUBLE_EQ(r.text_rect.height, 34);
+  EXPECT_EQ(std::vector<double>({r.patch_rect.center_x, r.patch_rect.angle, r.text_rect.center_y,
+                                 r.text_rect.height}),
+            std::vector<double>({11, 15, 32, 34}));
   EXPECT_EQ(r.patch.id, -2);
   EXPECT_EQ(r.patch.data, frame.patch1.data);
-  EXPECT_EQ(r.patch.width, 3);
-  EXPECT_EQ(r.patch.height, 2);
+  EXPECT_EQ(std::make_pair(r.patch.width, r.patch.height), std::make_pair(3, 2));
   EXPECT_EQ(r.patch.color_scale, frame.scales.data() + 3);
   EXPECT_EQ(r.patch.color_shift, frame.shifts.data() + 3);
   EXPECT_EQ(r.color.Packed(), 0x12345678);
   EXPECT_EQ(UnpackTextRecord(frame.Arrays(), 0, "").patch.id, 7);  // the low 32 bits only
 }
 
-TEST(UnpackTextRecord, ThePatchNeedsIdsAndAddressesAndShortArraysGiveDefaults) {
-  const TwoTexts frame;
+TEST(UnpackTextRecord, MissingPartsGiveDefaults) {
+  TwoTexts frame;
   FrameArrays arrays = frame.Arrays();
-  arrays.ids = {};
+  arrays.ids = {};  // no patch without both ids and addresses; rectangles and colour unaffected
   const TextRecord r = UnpackTextRecord(arrays, 0, "x");
   EXPECT_EQ(r.patch.id, -1);
   EXPECT_EQ(r.patch.data, nullptr);
   EXPECT_EQ(r.patch.color_scale, nullptr);
   EXPECT_EQ(r.patch.color_shift, nullptr);
-  EXPECT_DOUBLE_EQ(r.text_rect.center_x, 21);  // the rectangles and colour do not need it
+  EXPECT_DOUBLE_EQ(r.text_rect.center_x, 21);
   EXPECT_EQ(r.color.Packed(), static_cast<std::int32_t>(0xFF0000FFu));
 
   arrays = frame.Arrays();
@@ -114,17 +102,14 @@ TEST(UnpackTextRecord, ThePatchNeedsIdsAndAddressesAndShortArraysGiveDefaults) {
   EXPECT_DOUBLE_EQ(s.patch_rect.width, 13.0);
   EXPECT_FALSE(HasAllRects(arrays, 2));
   EXPECT_TRUE(HasAllRects(arrays, 1));
-  EXPECT_TRUE(HasAllRects(FrameArrays{}, 0));
-}
 
-TEST(UnpackTextRecord, APatchOfAnotherLayoutContributesNoPixels) {
-  TwoTexts frame;
+  // A patch that is not RGBA in one piece would be read past its end.
   frame.patch1 = cv::Mat(2, 3, CV_8UC3, cv::Scalar::all(1));
   ocr::log::ScopedCapture log;
-  const TextRecord r = UnpackTextRecord(frame.Arrays(), 1, "x");
-  EXPECT_EQ(r.patch.data, nullptr);
-  EXPECT_EQ(r.patch.width, 0);
-  EXPECT_EQ(r.patch.id, -2);
+  const TextRecord t = UnpackTextRecord(frame.Arrays(), 1, "x");
+  EXPECT_EQ(t.patch.data, nullptr);
+  EXPECT_EQ(std::make_pair(t.patch.width, t.patch.height), std::make_pair(0, 0));
+  EXPECT_EQ(t.patch.id, -2);
   EXPECT_TRUE(
       log.Contains("Vexel: patch matrix of text 1 is not 8-bit RGBA in one piece; not drawn.",
                    ocr::log::kError));
@@ -146,26 +131,6 @@ TEST(BackgroundRgba, PassesRgbaThroughAndConvertsOtherLayouts) {
   EXPECT_EQ(copied[4 * 5 + 2], 7);
   EXPECT_EQ(BackgroundRgba(cv::Mat(2, 2, CV_32FC4), scratch), nullptr);
   EXPECT_EQ(BackgroundRgba(cv::Mat(), scratch), nullptr);
-}
-
-TEST(FitBackground, KeepsTheImageAspectRatioInsideTheWindow) {
-  const struct {
-    int window_w, window_h, image_w, image_h;
-    BackgroundCorners corners;
-  } cases[] = {
-      {640, 480, 1280, 720, {-1.0f, 0.75f, 1.0f, -0.75f}},  // bars at top and bottom
-      {1280, 720, 640, 480, {-0.75f, 1.0f, 0.75f, -1.0f}},  // bars on the sides
-      {1280, 720, 640, 360, {-1.0f, 1.0f, 1.0f, -1.0f}},    // the whole window
-      {60000, 40000, 60000, 60000, {-2.0f / 3.0f, 1.0f, 2.0f / 3.0f, -1.0f}},  // no overflow
-  };
-  for (const auto& c : cases) {
-    const BackgroundCorners fit = FitBackground(c.window_w, c.window_h, c.image_w, c.image_h);
-    EXPECT_FLOAT_EQ(fit.left, c.corners.left) << c.window_w;
-    EXPECT_FLOAT_EQ(fit.top, c.corners.top) << c.window_w;
-    EXPECT_FLOAT_EQ(fit.right, c.corners.right) << c.window_w;
-    EXPECT_FLOAT_EQ(fit.bottom, c.corners.bottom) << c.window_w;
-  }
-  EXPECT_TRUE(FitBackground(100, 100, 7, 7).FillsWindow());
 }
 
 TEST(OrientRect, TurnsCentresAndAnglesPerOrientation) {

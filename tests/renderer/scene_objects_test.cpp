@@ -60,9 +60,7 @@ TEST_F(SceneObjectsTest, PatchesShareTheUnitSquareAndFadeThroughThePatchShaders)
         "vec2(1.0, 1.0)); float maxUVDist = max(uvCentered.x * uvCentered.x * uvCentered.x, "
         "uvCentered.y * uvCentered.y); const float minAlpha = 0.8; gl_FragColor *= vec4(1, 1, "
         "1, (1.0 - maxUVDist) + minAlpha); }",
-        "Material.setShaderSampler 1 texture0 InpaintedTexture*",
-        "Material.setShaderAutoUniform 0 worldViewProj 2", "Material.setBlendMode 0",
-        "Material.setDepthWriteEnabled false"}) {
+        "Material.setBlendMode 0", "Material.setDepthWriteEnabled false"}) {
     EXPECT_EQ(CountEntries(entry), 2) << entry;
   }
 }
@@ -80,10 +78,6 @@ TEST_F(SceneObjectsTest, BackgroundQuadShowsTheImageTurnedByTheRotationBehindThe
     Handler().CreateBackground(320, 180, rotation, -1.0f, 0.75f, 1.0f, -0.75f);
     EXPECT_EQ(MeshOf(*Handler().GetBackgroundObject()).uvs, uvs) << rotation;
   }
-  // On the corners, in the camera's pixels (640x480 around the origin).
-  const std::vector<Vexel::Vector3> positions = {
-      {320, -180, 0}, {320, 180, 0}, {-320, -180, 0}, {-320, 180, 0}};
-  EXPECT_EQ(MeshOf(*Handler().GetBackgroundObject()).positions, positions);
   for (const std::string entry :
        {"Mesh BackgroundRectMesh", "Texture RenderTexture",
         "Material.setShader 0 BackgroundImageVertShader #version 100\n attribute vec4 "
@@ -91,9 +85,7 @@ TEST_F(SceneObjectsTest, BackgroundQuadShowsTheImageTurnedByTheRotationBehindThe
         "main() { gl_Position = worldViewProj * position; oUv0 = uv0; }",
         "Material.setShader 1 BackgroundImageFragShader #version 100\n precision mediump int; "
         "precision mediump float; uniform sampler2D diffuseMap; varying vec2 oUv0; void main() "
-        "{ gl_FragColor = texture2D(diffuseMap, oUv0); }",
-        "Material.setShaderSampler 1 diffuseMap RenderTexture",
-        "Material.setShaderAutoUniform 0 worldViewProj 2"}) {
+        "{ gl_FragColor = texture2D(diffuseMap, oUv0); }"}) {
     EXPECT_EQ(CountEntries(entry), 5) << entry;
   }
   // Every rebuild replaced the old parts and attached the new quad before
@@ -122,38 +114,6 @@ TEST_F(SceneObjectsTest, BackgroundTakesFramesOfItsSizeOnly) {
       "background_image_height = 2 != 2"};
   EXPECT_EQ(log.Texts(), expected);
   EXPECT_EQ(log.Count(expected[0], ocr::log::kError), 1);
-}
-
-TEST_F(SceneObjectsTest, ANewTextHangsOverItsCorrectedPatchInItsSlot) {
-  const double scale[3] = {1.5, 1.0, 0.5};
-  const double shift[3] = {10, 20, 30};
-  const PositionScaleAngle text_place{-50.0f, 30.0f, 200.0f, 40.0f, 15.0f};
-  const PositionScaleAngle patch_place{-50.0f, 30.0f, 210.0f, 42.0f, 15.0f};
-  Handler().DrawTextObject(2, "Notausgang", text_place,
-                           Color::FromPacked(static_cast<std::int32_t>(0xFF336699u)), 7,
-                           pixels_.data(), scale, shift, 8, 6, patch_place);
-  const InpaintedTextObject& object = Current("Notausgang");
-  EXPECT_EQ(object.slot_index, 2u);
-  EXPECT_EQ(object.text->getColor(), Vexel::Color::fromBytes(0x99, 0x66, 0x33, 0xFF));
-  EXPECT_EQ(CountEntries("Text.normalizeText"), 1);
-  EXPECT_EQ(object.text->getRotation(), Vexel::Degrees(15.0f));
-  // Slot 2 (0 and 1 made, empty and detached) under the root: patch, then text.
-  EXPECT_EQ(Slot(0)->getParent(), nullptr);
-  EXPECT_EQ(Slot(2)->getParent(), Root());
-  ASSERT_EQ(Slot(2)->getChildCount(), 2u);
-  EXPECT_EQ(Slot(2)->getChild(0), object.patch.object.get());
-  EXPECT_EQ(Slot(2)->getChild(1), object.text.get());
-  const Vexel::Object& patch = *object.patch.object;
-  EXPECT_EQ(patch.getPosition(), Vexel::Vector3(-50.0f, 30.0f, -SceneHandler::kOverlayDepth));
-  EXPECT_EQ(patch.getScale(), Vexel::Vector3(210.0f, 42.0f, 1.0f));
-  EXPECT_EQ(patch.getRotation(), Vexel::Degrees(15.0f));
-  EXPECT_EQ(UniformsOf(*patch.getMaterial(0)).at("colorScale"), Vexel::Vector3(1.5f, 1.0f, 0.5f));
-  EXPECT_EQ(UniformsOf(*patch.getMaterial(0)).at("colorShift"), Vexel::Vector3(10, 20, 30));
-  // Without a correction the patch is drawn as delivered.
-  Draw(0, "Exit", 1, true);
-  const auto& plain = UniformsOf(*Current("Exit").patch.object->getMaterial(0));
-  EXPECT_EQ(plain.at("colorScale"), Vexel::Vector3(1, 1, 1));
-  EXPECT_EQ(plain.at("colorShift"), Vexel::Vector3(0, 0, 0));
 }
 
 TEST_F(SceneObjectsTest, ATextFitsItsRectangleCentredOnIt) {

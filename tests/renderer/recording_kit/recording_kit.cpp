@@ -150,15 +150,11 @@ ResourceManager& Kit::getResourceManager() {
 
 Renderer::Renderer(std::unique_ptr<Impl> impl) : impl_(std::move(impl)) {}
 Renderer::~Renderer() = default;
-void Renderer::setScene(Scene* /*scene*/) {
-  Record("Renderer.setScene");
-}
-AndroidSurfaceRenderer::AndroidSurfaceRenderer(Kit& /*kit*/, ANativeWindow* window,
+void Renderer::setScene(Scene* /*scene*/) {}
+AndroidSurfaceRenderer::AndroidSurfaceRenderer(Kit& /*kit*/, ANativeWindow* /*window*/,
                                                AntiAliasingSamples samples)
     : Renderer(nullptr) {
   Record("Renderer", samples);
-  if (window == nullptr)
-    throw Exception("recording kit: a surface renderer needs a window");
 }
 AndroidSurfaceRenderer::~AndroidSurfaceRenderer() {
   Record("~Renderer");
@@ -170,9 +166,7 @@ Scene::Scene(Kit& /*kit*/) : impl_(std::make_shared<Impl>()) {
 Scene::~Scene() {
   Record("~Scene");
 }
-void Scene::setBackgroundColor(const Color& c) {
-  Record("Scene.setBackgroundColor", c.r, c.g, c.b, c.a);
-}
+void Scene::setBackgroundColor(const Color& /*color*/) {}
 void Scene::setShadowEnabled(bool /*enabled*/) {}
 Node* Scene::getRootNode() {
   return &impl_->root;
@@ -244,9 +238,7 @@ Camera::Camera() : Node(std::make_unique<Impl>()) {
 Camera::~Camera() {
   Record("~Camera");
 }
-void Camera::setProjectionMode(ProjectionMode mode) {
-  Record("Camera.setProjectionMode", mode);
-}
+void Camera::setProjectionMode(ProjectionMode /*mode*/) {}
 void Camera::setOrthographicWindowSize(float width, float height) {
   Record("Camera.setOrthographicWindowSize", width, height);
   NodeOf(*this).ortho_width = width;
@@ -298,15 +290,12 @@ Material::~Material() {
 void Material::setShader(ShaderType type, const char* name, const char* source) {
   Record("Material.setShader", type, name, source);
 }
-void Material::setShaderSampler(ShaderType type, const char* name, Texture* texture) {
-  Record("Material.setShaderSampler", type, name, detail::Access::Ptr(*texture)->name);
-}
+void Material::setShaderSampler(ShaderType /*type*/, const char* /*name*/, Texture* /*texture*/) {}
 void Material::setShaderUniform(ShaderType /*type*/, const char* name, const Vector3& value) {
   impl_->uniforms[name] = value;
 }
-void Material::setShaderAutoUniform(ShaderType type, const char* name, AutoUniform value) {
-  Record("Material.setShaderAutoUniform", type, name, value);
-}
+void Material::setShaderAutoUniform(ShaderType /*type*/, const char* /*name*/,
+                                    AutoUniform /*value*/) {}
 void Material::setBlendMode(BlendMode mode) {
   Record("Material.setBlendMode", mode);
 }
@@ -321,10 +310,7 @@ Mesh::Mesh(const char* name) : impl_(std::make_shared<Impl>()) {
 Mesh::~Mesh() {
   Record("~Mesh", impl_->name);
 }
-void Mesh::begin(unsigned int /*vertexCount*/, unsigned int /*indexCount*/, RenderType /*type*/) {
-  impl_->positions.clear();
-  impl_->uvs.clear();
-}
+void Mesh::begin(unsigned int /*vertexCount*/, unsigned int /*indexCount*/, RenderType /*type*/) {}
 void Mesh::position(float x, float y, float z) {
   impl_->positions.emplace_back(x, y, z);
 }
@@ -379,7 +365,6 @@ Text::~Text() {
 }
 void Text::setFont(const Font& /*font*/) {}
 void Text::setText(const std::string& utf8) {
-  Record("Text.setText", utf8);
   NodeOf(*this).text = utf8;
 }
 const std::string& Text::getText() const {
@@ -404,14 +389,9 @@ Color Text::getColor() const {
 }
 void Text::initialize() {}
 Rect Text::getBoundingBox() const {
-  const std::string& text = NodeOf(*this).text;
-  // Every byte but a UTF-8 continuation byte starts a code point.
-  const auto code_points = std::count_if(text.begin(), text.end(), [](char byte) {
-    return (static_cast<unsigned char>(byte) & 0xC0u) != 0x80u;
-  });
-  if (code_points == 0)
+  const auto n = static_cast<float>(NodeOf(*this).text.size());
+  if (n == 0.0f)
     return Rect();
-  const auto n = static_cast<float>(code_points);
   const float width = 0.5f * n + NodeOf(*this).extra_spacing * (n - 1.0f);
   return Rect(-width / 2.0f, 0.0f, width / 2.0f, -1.2f);
 }

@@ -8,9 +8,9 @@
 // order, with their arguments: "Kit Vexel.log", "Texture.setImage
 // InpaintedTexture0 8 6 8", "~Text Exit"...
 //
-// Text metrics are made up: half an em per code point plus the extra
-// spacing between neighbours; the line box is 1.2 em tall with its top at
-// y = 0 and it is centred on x = 0.
+// Text metrics are made up: half an em per byte plus the extra spacing
+// between neighbours; the line box is 1.2 em tall with its top at y = 0 and
+// it is centred on x = 0.
 
 #include <map>
 #include <set>
