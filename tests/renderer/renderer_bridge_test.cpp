@@ -81,18 +81,6 @@ class RendererBridgeTest : public testing::RecordingScene {
   cv::Mat image_ = cv::Mat(180, 320, CV_8UC4, cv::Scalar::all(50));
 };
 
-TEST_F(RendererBridgeTest, CallsBeforeInitialisationOnlyLog) {
-  ocr::log::ScopedCapture log;
-  HostFrame frame;
-  Render(frame.Add("Exit"), &image_);
-  bridge::SetOrientation(90);
-  bridge::ShutDown();
-  EXPECT_TRUE(Journal().empty());
-  EXPECT_EQ(log.Texts(),
-            (std::vector<std::string>{FrameLine(image_, 1), "Vexel: Set renderer orientation 90.",
-                                      "Vexel: shutDown renderer."}));
-}
-
 TEST_F(RendererBridgeTest, InitBuildsTheSceneAndFitsTheBackground) {
   ocr::log::ScopedCapture log;
   ASSERT_TRUE(Init());
@@ -159,10 +147,7 @@ TEST_F(RendererBridgeTest, AFrameDrawsEachTextAtItsMappedPlaceInItsCorrectedColo
   EXPECT_EQ(exit.text->getColor(), Vexel::Color::fromBytes(210, 255, 0));
   EXPECT_EQ(vexel_recording::UniformsOf(*patch.getMaterial(0)).at("colorScale"),
             Vexel::Vector3(2.0f, 20.0f, 0.5f));
-  const InpaintedTextObject& ausgang = Current("Ausgang");
-  EXPECT_EQ(ausgang.slot_index, 1u);
-  EXPECT_NEAR(ausgang.patch.object->getRotation().valueDegrees(), 30.0f, 1e-4f);
-  EXPECT_NEAR(ausgang.patch.object->getPosition().x, 0.0f, 1e-3f);
+  EXPECT_NEAR(Current("Ausgang").patch.object->getRotation().valueDegrees(), 30.0f, 1e-4f);
 }
 
 TEST_F(RendererBridgeTest, AnEmptyFrameKeepsTheTextsForReuseAndStillDrawsTheBackground) {
