@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "common/log.h"
+#include "recording_scene.h"
 #include "renderer/background_frame.h"
 #include "renderer/color_correction.h"
 #include "renderer/frame_records.h"
@@ -14,10 +15,6 @@
 
 namespace ocr_ar {
 namespace {
-
-long long AddressOf(const cv::Mat& mat) {
-  return reinterpret_cast<long long>(&mat);
-}
 
 TEST(ColorCorrection, ScalesShiftsClampsAndTruncatesKeepingAlpha) {
   const double nan = std::numeric_limits<double>::quiet_NaN();
@@ -40,38 +37,27 @@ TEST(ColorCorrection, ScalesShiftsClampsAndTruncatesKeepingAlpha) {
   }
 }
 
-// The arrays of a two-text frame.
-struct TwoTexts {
-  std::vector<double> patch_rects{1, 2, 3, 4, 5, 11, 12, 13, 14, 15};
-  std::vector<double> text_rects{21, 22, 23, 24, 25, 31, 32, 33, 34, 35};
-  std::vector<std::int64_t> ids{0x100000007LL, -2};
-  cv::Mat patch0 = cv::Mat(4, 6, CV_8UC4, cv::Scalar::all(9));
-  cv::Mat patch1 = cv::Mat(2, 3, CV_8UC4, cv::Scalar::all(7));
-  std::vector<std::int64_t> addresses{AddressOf(patch0), AddressOf(patch1)};
-  std::vector<double> scales{1, 2, 3, 4, 5, 6};
-  std::vector<double> shifts{-1, -2, -3, -4, -5, -6};
-  std::vector<std::int32_t> colors{static_cast<std::int32_t>(0xFF0000FFu), 0x12345678};
-
-  FrameArrays Arrays() const {
-    return {{patch_rects.data(), patch_rects.size()},
-            {text_rects.data(), text_rects.size()},
-            {ids.data(), ids.size()},
-            {addresses.data(), addresses.size()},
-            {scales.data(), scales.size()},
-            {shifts.data(), shifts.size()},
-            {colors.data(), colors.size()}};
-  }
-};
+// Two texts whose values all differ.
+testing::HostFrame TwoTexts() {
+  testing::HostFrame frame;
+  frame.Add("eins", {1, 2, 3, 4, 5}, 0x100000007LL, 0xFF0000FFu)
+      .Add("zwei", {11, 12, 13, 14, 15}, -2, 0x12345678u);
+  frame.text_rects = {21, 22, 23, 24, 25, 31, 32, 33, 34, 35};
+  frame.scales = {1, 2, 3, 4, 5, 6};
+  frame.shifts = {-1, -2, -3, -4, -5, -6};
+  frame.patches[1] = cv::Mat(2, 3, CV_8UC4);
+  return frame;
+}
 
 TEST(UnpackTextRecord, ReadsEachArrayAtTheTextsOffset) {
-  const TwoTexts frame;
+  testing::HostFrame frame = TwoTexts();
   const TextRecord r = UnpackTextRecord(frame.Arrays(), 1, "zwei");
   EXPECT_EQ(r.text, "zwei");
   EXPECT_EQ(std::vector<double>({r.patch_rect.center_x, r.patch_rect.angle, r.text_rect.center_y,
                                  r.text_rect.height}),
             std::vector<double>({11, 15, 32, 34}));
   EXPECT_EQ(r.patch.id, -2);
-  EXPECT_EQ(r.patch.data, frame.patch1.data);
+  EXPECT_EQ(r.patch.data, frame.patches[1].data);
   EXPECT_EQ(std::make_pair(r.patch.width, r.patch.height), std::make_pair(3, 2));
   EXPECT_EQ(r.patch.color_scale, frame.scales.data() + 3);
   EXPECT_EQ(r.patch.color_shift, frame.shifts.data() + 3);
@@ -80,7 +66,7 @@ TEST(UnpackTextRecord, ReadsEachArrayAtTheTextsOffset) {
 }
 
 TEST(UnpackTextRecord, MissingPartsGiveDefaults) {
-  TwoTexts frame;
+  testing::HostFrame frame = TwoTexts();
   FrameArrays arrays = frame.Arrays();
   arrays.ids = {};  // no patch without both ids and addresses; rectangles and colour unaffected
   const TextRecord r = UnpackTextRecord(arrays, 0, "x");
@@ -104,7 +90,7 @@ TEST(UnpackTextRecord, MissingPartsGiveDefaults) {
   EXPECT_TRUE(HasAllRects(arrays, 1));
 
   // A patch that is not RGBA in one piece would be read past its end.
-  frame.patch1 = cv::Mat(2, 3, CV_8UC3, cv::Scalar::all(1));
+  frame.patches[1] = cv::Mat(2, 3, CV_8UC3);
   ocr::log::ScopedCapture log;
   const TextRecord t = UnpackTextRecord(frame.Arrays(), 1, "x");
   EXPECT_EQ(t.patch.data, nullptr);

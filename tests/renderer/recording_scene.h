@@ -3,11 +3,14 @@
 #include <android/native_window.h>
 #include <gtest/gtest.h>
 
+#include <opencv2/core.hpp>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "platform/desktop.h"
 #include "recording_kit.h"
+#include "renderer/frame_records.h"
 #include "renderer/renderer_bridge.h"
 #include "renderer/scene_handler.h"
 
@@ -17,6 +20,43 @@ using vexel_recording::CountEntries;
 using vexel_recording::FindEntry;
 using vexel_recording::Journal;
 using vexel_recording::LiveCount;
+
+// One frame's host data: per text, one rectangle given for both its patch
+// and its text, an 8x4 RGBA patch and no colour correction.
+struct HostFrame {
+  std::vector<std::optional<std::string>> texts;
+  std::vector<double> patch_rects, text_rects, scales, shifts;
+  std::vector<std::int64_t> ids, addresses;
+  std::vector<cv::Mat> patches;
+  std::vector<std::int32_t> colors;
+
+  HostFrame& Add(const std::optional<std::string>& text,
+                 std::vector<double> rect = {80, 45, 40, 10, 0}, std::int64_t id = 1,
+                 std::uint32_t color = 0xFF000000u) {
+    texts.push_back(text);
+    patch_rects.insert(patch_rects.end(), rect.begin(), rect.end());
+    text_rects.insert(text_rects.end(), rect.begin(), rect.end());
+    ids.push_back(id);
+    patches.emplace_back(4, 8, CV_8UC4, cv::Scalar::all(100));
+    colors.push_back(static_cast<std::int32_t>(color));
+    scales.insert(scales.end(), {1.0, 1.0, 1.0});
+    shifts.insert(shifts.end(), {0.0, 0.0, 0.0});
+    return *this;
+  }
+
+  FrameArrays Arrays() {
+    addresses.clear();
+    for (const cv::Mat& patch : patches)
+      addresses.push_back(reinterpret_cast<std::int64_t>(&patch));
+    return {{patch_rects.data(), patch_rects.size()},
+            {text_rects.data(), text_rects.size()},
+            {ids.data(), ids.size()},
+            {addresses.data(), addresses.size()},
+            {scales.data(), scales.size()},
+            {shifts.data(), shifts.size()},
+            {colors.data(), colors.size()}};
+  }
+};
 
 // The scene handler over the recording kit with a 640x480 offscreen window;
 // shut down after each test like the host does.

@@ -3,8 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <opencv2/core.hpp>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -15,41 +13,9 @@ namespace ocr_ar {
 namespace {
 
 using testing::CountEntries;
+using testing::HostFrame;
 using testing::Journal;
 using testing::LiveCount;
-
-// One frame's host data. Each text gets one rectangle for both its patch
-// and its text, an 8x4 RGBA patch and no colour correction.
-struct HostFrame {
-  std::vector<std::optional<std::string>> texts;
-  std::vector<double> rects, scales, shifts;
-  std::vector<std::int64_t> ids, addresses;
-  std::vector<cv::Mat> patches;
-  std::vector<std::int32_t> colors;
-
-  HostFrame& Add(const std::optional<std::string>& text,
-                 std::vector<double> rect = {80, 45, 40, 10, 0}, std::int64_t id = 1,
-                 std::uint32_t color = 0xFF000000u) {
-    texts.push_back(text);
-    rects.insert(rects.end(), rect.begin(), rect.end());
-    ids.push_back(id);
-    patches.emplace_back(4, 8, CV_8UC4, cv::Scalar::all(100));
-    colors.push_back(static_cast<std::int32_t>(color));
-    scales.insert(scales.end(), {1.0, 1.0, 1.0});
-    shifts.insert(shifts.end(), {0.0, 0.0, 0.0});
-    return *this;
-  }
-
-  FrameArrays Arrays() {
-    addresses.clear();
-    for (const cv::Mat& patch : patches)
-      addresses.push_back(reinterpret_cast<std::int64_t>(&patch));
-    return {{rects.data(), rects.size()},   {rects.data(), rects.size()},
-            {ids.data(), ids.size()},       {addresses.data(), addresses.size()},
-            {scales.data(), scales.size()}, {shifts.data(), shifts.size()},
-            {colors.data(), colors.size()}};
-  }
-};
 
 std::string FrameLine(const cv::Mat& image, int texts) {
   char line[128];
@@ -211,7 +177,8 @@ TEST_F(RendererBridgeTest, EachFailingCallIsLoggedAndTheFrameGoesOn) {
 TEST_F(RendererBridgeTest, ShortRectangleArraysAreReportedAndDrawnEmpty) {
   ASSERT_TRUE(Init());
   HostFrame frame;
-  frame.Add("eins").Add("zwei").rects.resize(5);
+  frame.Add("eins").Add("zwei").text_rects.resize(5);
+  frame.patch_rects.resize(5);
   ocr::log::ScopedCapture log;
   Render(frame);
   EXPECT_EQ(log.Count("Vexel: renderOneFrame needs 5 values per text in patchRects and "
