@@ -54,9 +54,9 @@ TEST_F(SceneHandlerTest, DestructionGoesChildrenFirstThenSceneRendererKit) {
   Journal().clear();
   SceneHandler::DeleteInstance();
   int at = 0;
-  for (const char* entry : {"~Text Hallo", "~Camera", "~Material", "~Texture RenderTexture",
-                            "~Mesh BackgroundRectMesh", "~Font NotoSansCJK-Regular.ttc",
-                            "~Mesh InpaintedRectMesh", "~Scene", "~Renderer", "~Kit"}) {
+  for (const char* entry : {"~Text", "~Camera", "~Material", "~Texture RenderTexture",
+                            "~Mesh BackgroundRectMesh", "~Font NotoSansCJK-Regular.ttc 2 true",
+                            "~Mesh InpaintedRectMesh", "~Scene", "~Renderer 0", "~Kit Vexel.log"}) {
     const int found = FindEntry(entry, at);
     ASSERT_GE(found, 0) << entry << " missing or out of order";
     at = found + 1;

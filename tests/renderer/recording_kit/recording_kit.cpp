@@ -16,25 +16,45 @@ struct Access {
 };
 }  // namespace detail
 
-struct Renderer::Impl {};
-struct Scene::Impl {
+// Journals its object's construction ("Texture RenderTexture") and, with a
+// leading '~', destruction, counting the live objects of the class named by
+// the entry's first word; construction throws while that class is listed as
+// failing. An empty entry (a plain group node) is not tracked.
+struct Tracked {
+  explicit Tracked(std::string journal_entry);
+  ~Tracked();
+  std::string entry;
+};
+
+struct Kit::Impl : Tracked {
+  using Tracked::Tracked;
+};
+struct Renderer::Impl : Tracked {
+  using Tracked::Tracked;
+};
+struct Scene::Impl : Tracked {
+  using Tracked::Tracked;
   EmptyNode root;
 };
-struct Texture::Impl {
-  std::string name;
+struct Texture::Impl : Tracked {
+  using Tracked::Tracked;
+  std::string name = entry.substr(entry.find(' ') + 1);
   int width = 0, height = 0;
 };
-struct Material::Impl {
+struct Material::Impl : Tracked {
+  using Tracked::Tracked;
   std::map<std::string, Vector3> uniforms;
 };
-struct Mesh::Impl : vexel_recording::MeshData {
-  std::string name;
+struct Mesh::Impl : Tracked, vexel_recording::MeshData {
+  using Tracked::Tracked;
 };
-struct Font::Impl {
+struct Font::Impl : Tracked {
+  using Tracked::Tracked;
   std::string name;
   std::uint32_t reference_character = 0;
 };
-struct Node::Impl {
+struct Node::Impl : Tracked {
+  using Tracked::Tracked;
   Node* owner = nullptr;
   Impl* parent = nullptr;
   std::vector<Impl*> children;
@@ -94,21 +114,23 @@ const std::map<std::string, Vexel::Vector3>& UniformsOf(const Vexel::Material& m
 namespace Vexel {
 namespace {
 
-// Journals one call with its arguments, or throws if its operation is
-// listed as failing. A first word without a '.' is a constructor ("Text")
-// or, after '~', a destructor, and counts its class's live objects.
 template <typename... Args>
-void Record(const std::string& operation, const Args&... args) {
-  if (vexel_recording::Failures().count(operation) != 0)
-    throw Exception("recording kit: " + operation + " fails as asked");
+std::string Entry(const std::string& operation, const Args&... args) {
   std::ostringstream entry;
   entry << std::boolalpha << operation;
   ((entry << ' ' << args), ...);
-  vexel_recording::Journal().push_back(entry.str());
-  if (operation[0] == '~')
-    --vexel_recording::LiveCount(operation.substr(1));
-  else if (operation.find('.') == std::string::npos)
-    ++vexel_recording::LiveCount(operation);
+  return entry.str();
+}
+
+// Journals one call, or throws if its operation (the entry's first word) is
+// listed as failing.
+template <typename... Args>
+void Record(const std::string& operation, const Args&... args) {
+  std::string entry = Entry(operation, args...);
+  const std::string name = entry.substr(0, entry.find(' '));
+  if (vexel_recording::Failures().count(name) != 0)
+    throw Exception("recording kit: " + name + " fails as asked");
+  vexel_recording::Journal().push_back(std::move(entry));
 }
 
 Node::Impl& NodeOf(const Node& node) {
@@ -131,16 +153,25 @@ void DetachChildren(Node::Impl& node) {
 
 }  // namespace
 
+Tracked::Tracked(std::string journal_entry) : entry(std::move(journal_entry)) {
+  if (entry.empty())
+    return;
+  Record(entry);
+  ++vexel_recording::LiveCount(entry.substr(0, entry.find(' ')));
+}
+Tracked::~Tracked() {
+  if (entry.empty())
+    return;
+  vexel_recording::Journal().push_back("~" + entry);
+  --vexel_recording::LiveCount(entry.substr(0, entry.find(' ')));
+}
+
 ResourceManager::ResourceManager(std::shared_ptr<Impl> impl) : impl_(std::move(impl)) {}
 ResourceManager::~ResourceManager() = default;
 
-Kit::Kit(AAssetManager* /*assets*/, const std::string& logFile) {
-  Record("Kit", logFile);
-  resources_.reset(new ResourceManager(nullptr));
-}
-Kit::~Kit() {
-  Record("~Kit");
-}
+Kit::Kit(AAssetManager* /*assets*/, const std::string& logFile)
+    : impl_(std::make_shared<Impl>("Kit " + logFile)), resources_(new ResourceManager(nullptr)) {}
+Kit::~Kit() = default;
 void Kit::drawAll() {
   Record("Kit.drawAll");
 }
@@ -153,19 +184,11 @@ Renderer::~Renderer() = default;
 void Renderer::setScene(Scene* /*scene*/) {}
 AndroidSurfaceRenderer::AndroidSurfaceRenderer(Kit& /*kit*/, ANativeWindow* /*window*/,
                                                AntiAliasingSamples samples)
-    : Renderer(nullptr) {
-  Record("Renderer", samples);
-}
-AndroidSurfaceRenderer::~AndroidSurfaceRenderer() {
-  Record("~Renderer");
-}
+    : Renderer(std::make_unique<Impl>(Entry("Renderer", samples))) {}
+AndroidSurfaceRenderer::~AndroidSurfaceRenderer() = default;
 
-Scene::Scene(Kit& /*kit*/) : impl_(std::make_shared<Impl>()) {
-  Record("Scene");
-}
-Scene::~Scene() {
-  Record("~Scene");
-}
+Scene::Scene(Kit& /*kit*/) : impl_(std::make_shared<Impl>("Scene")) {}
+Scene::~Scene() = default;
 void Scene::setBackgroundColor(const Color& /*color*/) {}
 void Scene::setShadowEnabled(bool /*enabled*/) {}
 Node* Scene::getRootNode() {
@@ -229,15 +252,11 @@ Degrees Node::getRotation() const {
   return Degrees(impl_->rotation);
 }
 
-EmptyNode::EmptyNode() : Node(std::make_unique<Impl>()) {}
+EmptyNode::EmptyNode() : Node(std::make_unique<Impl>("")) {}
 EmptyNode::~EmptyNode() = default;
 
-Camera::Camera() : Node(std::make_unique<Impl>()) {
-  Record("Camera");
-}
-Camera::~Camera() {
-  Record("~Camera");
-}
+Camera::Camera() : Node(std::make_unique<Impl>("Camera")) {}
+Camera::~Camera() = default;
 void Camera::setProjectionMode(ProjectionMode /*mode*/) {}
 void Camera::setOrthographicWindowSize(float width, float height) {
   Record("Camera.setOrthographicWindowSize", width, height);
@@ -255,13 +274,8 @@ void Camera::setNearClipDistance(float /*distance*/) {}
 void Camera::setFarClipDistance(float /*distance*/) {}
 
 Texture::Texture(ResourceManager& /*resources*/, const char* name, Type /*type*/, bool /*mipmaps*/)
-    : impl_(std::make_shared<Impl>()) {
-  Record("Texture", name);
-  impl_->name = name;
-}
-Texture::~Texture() {
-  Record("~Texture", impl_->name);
-}
+    : impl_(std::make_shared<Impl>(Entry("Texture", name))) {}
+Texture::~Texture() = default;
 void Texture::setImage(const unsigned char* /*data*/, int width, int height, PixelFormat format) {
   Record("Texture.setImage", impl_->name, width, height, format);
   impl_->width = width;
@@ -281,12 +295,8 @@ void Texture::setMagFilterMode(FilterMode /*mode*/) {}
 void Texture::setUWrapMode(WrapMode /*mode*/) {}
 void Texture::setVWrapMode(WrapMode /*mode*/) {}
 
-Material::Material(ResourceManager& /*resources*/) : impl_(std::make_shared<Impl>()) {
-  Record("Material");
-}
-Material::~Material() {
-  Record("~Material");
-}
+Material::Material(ResourceManager& /*resources*/) : impl_(std::make_shared<Impl>("Material")) {}
+Material::~Material() = default;
 void Material::setShader(ShaderType type, const char* name, const char* source) {
   Record("Material.setShader", type, name, source);
 }
@@ -303,13 +313,8 @@ void Material::setDepthWriteEnabled(bool enabled) {
   Record("Material.setDepthWriteEnabled", enabled);
 }
 
-Mesh::Mesh(const char* name) : impl_(std::make_shared<Impl>()) {
-  Record("Mesh", name);
-  impl_->name = name;
-}
-Mesh::~Mesh() {
-  Record("~Mesh", impl_->name);
-}
+Mesh::Mesh(const char* name) : impl_(std::make_shared<Impl>(Entry("Mesh", name))) {}
+Mesh::~Mesh() = default;
 void Mesh::begin(unsigned int /*vertexCount*/, unsigned int /*indexCount*/, RenderType /*type*/) {}
 void Mesh::position(float x, float y, float z) {
   impl_->positions.emplace_back(x, y, z);
@@ -325,13 +330,10 @@ void Mesh::index(unsigned int /*vertex*/) {}
 void Mesh::end() {}
 void Mesh::finalize() {}
 
-Object::Object(const Mesh& mesh) : Node(std::make_unique<Impl>()) {
+Object::Object(const Mesh& mesh) : Node(std::make_unique<Impl>("Object")) {
   NodeOf(*this).mesh = detail::Access::Ptr(mesh);
-  Record("Object", NodeOf(*this).mesh->name);
 }
-Object::~Object() {
-  Record("~Object");
-}
+Object::~Object() = default;
 void Object::setMaterial(unsigned int /*index*/, Material* material) {
   NodeOf(*this).material = material;
 }
@@ -340,13 +342,10 @@ Material* Object::getMaterial(unsigned int index) const {
 }
 
 Font::Font(const std::string& name, FileType fileType, bool antialiased)
-    : impl_(std::make_shared<Impl>()) {
-  Record("Font", name, fileType, antialiased);
+    : impl_(std::make_shared<Impl>(Entry("Font", name, fileType, antialiased))) {
   impl_->name = name;
 }
-Font::~Font() {
-  Record("~Font", impl_->name);
-}
+Font::~Font() = default;
 const std::string& Font::getName() const {
   return impl_->name;
 }
@@ -357,12 +356,8 @@ std::uint32_t Font::getReferenceCharacter() const {
   return impl_->reference_character;
 }
 
-Text::Text() : Node(std::make_unique<Impl>()) {
-  Record("Text");
-}
-Text::~Text() {
-  Record("~Text", NodeOf(*this).text);
-}
+Text::Text() : Node(std::make_unique<Impl>("Text")) {}
+Text::~Text() = default;
 void Text::setFont(const Font& /*font*/) {}
 void Text::setText(const std::string& utf8) {
   NodeOf(*this).text = utf8;

@@ -4,9 +4,9 @@
 // the renderer's C++ tests, linked in place of libVexelKit: no graphics
 // device. It defines only the operations the renderer calls (plus a few
 // getters of the real interface the tests read), keeps the scene graph and
-// node transforms, and writes the calls the tests check to one journal, in
-// order, with their arguments: "Kit Vexel.log", "Texture.setImage
-// InpaintedTexture0 8 6 8", "~Text Exit"...
+// node transforms, and writes object lifetimes and the calls the tests check
+// to one journal, in order, with their arguments: "Kit Vexel.log",
+// "Texture.setImage InpaintedTexture0 8 6 8", "~Texture RenderTexture"...
 //
 // Text metrics are made up: half an em per byte plus the extra spacing
 // between neighbours; the line box is 1.2 em tall with its top at y = 0 and
