@@ -178,7 +178,6 @@ TEST_F(RendererBridgeTest, ShortRectangleArraysAreReportedAndDrawnEmpty) {
   ASSERT_TRUE(Init());
   HostFrame frame;
   frame.Add("eins").Add("zwei").text_rects.resize(5);
-  frame.patch_rects.resize(5);
   ocr::log::ScopedCapture log;
   Render(frame);
   EXPECT_EQ(log.Count("Vexel: renderOneFrame needs 5 values per text in patchRects and "
