@@ -1,268 +1,159 @@
 #include "renderer/renderer_bridge.h"
 
-#include <android/native_window.h>
 #include <gtest/gtest.h>
 
-#include <opencv2/core.hpp>
-#include <optional>
+#include <cstdio>
 #include <string>
 #include <vector>
 
 #include "common/log.h"
-#include "platform/desktop.h"
-#include "recording_kit.h"
-#include "renderer/scene_handler.h"
+#include "recording_scene.h"
 
 namespace ocr_ar {
 namespace {
 
-using vexel_recording::CountEntries;
-using vexel_recording::LiveCount;
-using vexel_recording::NodeState;
-using vexel_recording::StateOf;
+using testing::CountEntries;
+using testing::HostFrame;
+using testing::Journal;
+using testing::LiveCount;
 
-// One frame's host data: texts and the per-text arrays.
-struct HostFrame {
-  std::vector<std::optional<std::string>> texts;
-  std::vector<double> patch_rects;
-  std::vector<double> text_rects;
-  std::vector<std::int64_t> ids;
-  std::vector<cv::Mat> patches;
-  std::vector<std::int64_t> patch_addresses;
-  std::vector<double> scales;
-  std::vector<double> shifts;
-  std::vector<std::int32_t> colors;
+std::string FrameLine(const cv::Mat& image, int texts) {
+  char line[128];
+  std::snprintf(line, sizeof(line), "Vexel: renderOneFrame image(%p %d %d) text(%d)",
+                static_cast<void*>(image.data), image.cols, image.rows, texts);
+  return line;
+}
 
-  void Add(const std::optional<std::string>& text, std::vector<double> rect, std::int64_t id,
-           std::int32_t color = static_cast<std::int32_t>(0xFF000000u)) {
-    texts.push_back(text);
-    patch_rects.insert(patch_rects.end(), rect.begin(), rect.end());
-    text_rects.insert(text_rects.end(), rect.begin(), rect.end());
-    ids.push_back(id);
-    patches.emplace_back(4, 8, CV_8UC4, cv::Scalar::all(100));
-    colors.push_back(color);
-    scales.insert(scales.end(), {1.0, 1.0, 1.0});
-    shifts.insert(shifts.end(), {0.0, 0.0, 0.0});
-  }
-
-  FrameArrays Arrays() {
-    patch_addresses.clear();
-    for (const cv::Mat& patch : patches)
-      patch_addresses.push_back(reinterpret_cast<std::int64_t>(&patch));
-    FrameArrays a;
-    a.patch_rects = {patch_rects.data(), patch_rects.size()};
-    a.text_rects = {text_rects.data(), text_rects.size()};
-    a.ids = {ids.data(), ids.size()};
-    a.patch_mat_addrs = {patch_addresses.data(), patch_addresses.size()};
-    a.color_scales = {scales.data(), scales.size()};
-    a.color_shifts = {shifts.data(), shifts.size()};
-    a.colors = {colors.data(), colors.size()};
-    return a;
-  }
-};
-
-class RendererBridgeTest : public ::testing::Test {
+// The bridge drives the scene handler; the 320x180 camera image fills
+// 640x360 of the 640x480 window, rows 60 to 420.
+class RendererBridgeTest : public testing::RecordingScene {
  protected:
-  static constexpr int kWindowWidth = 640;
-  static constexpr int kWindowHeight = 480;
-  static constexpr int kImageWidth = 320;
-  static constexpr int kImageHeight = 180;
-
-  void SetUp() override {
-    vexel_recording::ClearJournal();
-    vexel_recording::ClearFailures();
-    window_ = platform::desktop::CreateOffscreenWindow(kWindowWidth, kWindowHeight);
-  }
-  void TearDown() override {
-    vexel_recording::ClearFailures();
-    if (SceneHandler::Instance()->HasRenderer())
-      bridge::SetOrientation(0);  // the orientation outlives the renderer
-    bridge::ShutDown();
-    ANativeWindow_release(window_);
-  }
-
-  bool Init(int width = kImageWidth, int height = kImageHeight) {
+  bool Init() {
     return bridge::InitFromSurface(
         [this] {
           ANativeWindow_acquire(window_);
           return window_;
         },
-        width, height);
+        320, 180);
   }
-
   void Render(HostFrame& frame, const cv::Mat* image = nullptr) {
-    const FrameArrays arrays = frame.Arrays();
     bridge::RenderOneFrame(
-        image, frame.texts.size(), [&frame](std::size_t i) { return frame.texts[i]; }, arrays);
+        image, frame.texts.size(), [&frame](std::size_t i) { return frame.texts[i]; },
+        frame.Arrays());
   }
 
-  SceneHandler& Handler() { return *SceneHandler::Instance(); }
+  SceneHandler& Instance() { return *SceneHandler::Instance(); }  // not initialised by itself
 
-  const InpaintedTextObject& Current(const std::string& text) {
-    return Handler().GetCurrentTextCache().at(text).front();
-  }
-
-  ANativeWindow* window_ = nullptr;
+  cv::Mat image_ = cv::Mat(180, 320, CV_8UC4, cv::Scalar::all(50));
 };
-
-TEST_F(RendererBridgeTest, CallsBeforeInitialisationOnlyLog) {
-  ocr::log::ScopedCapture log;
-  HostFrame frame;
-  frame.Add("Exit", {10, 10, 40, 10, 0}, 1);
-  const cv::Mat image(kImageHeight, kImageWidth, CV_8UC4);
-  Render(frame, &image);
-  bridge::SetOrientation(90);
-  bridge::ShutDown();
-  EXPECT_TRUE(vexel_recording::Journal().empty());
-  EXPECT_FALSE(bridge::GetRenderTranslate());
-  EXPECT_TRUE(log.Contains("Vexel: Set renderer orientation 90.", ocr::log::kInfo));
-  EXPECT_EQ(log.Count("Vexel: shutDown renderer.", ocr::log::kInfo), 1);
-  EXPECT_EQ(log.Records().size(), 3u);
-}
 
 TEST_F(RendererBridgeTest, InitBuildsTheSceneAndFitsTheBackground) {
   ocr::log::ScopedCapture log;
   ASSERT_TRUE(Init());
-  ASSERT_TRUE(Handler().HasRenderer());
-  float l = 0, t = 0, r = 0, b = 0;
-  Handler().GetBackgroundRectCorners(&l, &t, &r, &b);
-  EXPECT_FLOAT_EQ(l, -1.0f);
-  EXPECT_FLOAT_EQ(t, 0.75f);
-  EXPECT_FLOAT_EQ(r, 1.0f);
-  EXPECT_FLOAT_EQ(b, -0.75f);
-  EXPECT_EQ(Handler().GetBackgroundWidth(), kImageWidth);
-  EXPECT_EQ(Handler().GetBackgroundHeight(), kImageHeight);
-  const std::vector<ocr::log::Record> records = log.Records();
+  std::vector<float> corners(4);
+  Instance().GetBackgroundRectCorners(&corners[0], &corners[1], &corners[2], &corners[3]);
+  EXPECT_EQ(corners, (std::vector<float>{-1.0f, 0.75f, 1.0f, -0.75f}));
+  EXPECT_EQ(Instance().GetBackgroundWidth(), 320);
   const std::vector<std::string> expected = {
       "Vexel: Init renderer 640 480.", "Vexel: Init background 320 180.",
       "VexelJNI::InitBackground background_width = 320, background_height = 180 \r\n",
       "VexelJNI::InitBackground native_window_width = 640, native_window_height = 480 \r\n",
       "VexelJNI::InitBackground rotation = 0 \r\n"};
   EXPECT_EQ(log.Texts(), expected);
-  EXPECT_EQ(records[0].priority, ocr::log::kInfo);
-  EXPECT_EQ(records[2].priority, ocr::log::kDebug);
-}
+  EXPECT_EQ(log.Records()[1].priority, ocr::log::kInfo);
+  EXPECT_EQ(log.Records()[2].priority, ocr::log::kDebug);
 
-TEST_F(RendererBridgeTest, InitOnALiveWindowShutsTheOldRendererDownFirst) {
+  // Again on the live window: the old renderer is shut down first.
   ASSERT_TRUE(Init());
-  ocr::log::ScopedCapture log;
-  ASSERT_TRUE(Init());
-  EXPECT_TRUE(log.Contains("Vexel: initFromSurface called with non-null s_native_window!",
-                           ocr::log::kError));
-  EXPECT_TRUE(log.Contains("Vexel: shutDown renderer."));
-  EXPECT_EQ(LiveCount("Kit"), 1);
+  EXPECT_EQ(
+      log.Count("Vexel: initFromSurface called with non-null s_native_window!", ocr::log::kError),
+      1);
+  EXPECT_EQ(log.Count("Vexel: shutDown renderer.", ocr::log::kInfo), 1);
   EXPECT_EQ(LiveCount("Renderer"), 1);
 }
 
-TEST_F(RendererBridgeTest, InitWithoutWindowOrWithAnEmptyOneReportsAndReturnsTrue) {
+TEST_F(RendererBridgeTest, InitFailuresAreReported) {
   ocr::log::ScopedCapture log;
   EXPECT_TRUE(bridge::InitFromSurface([] { return nullptr; }, 4, 4));
   EXPECT_TRUE(log.Contains("Vexel: Init failed, s_native_window is null!", ocr::log::kError));
-  EXPECT_FALSE(Handler().HasRenderer());
-
   ANativeWindow* empty = platform::desktop::CreateOffscreenWindow(0, 10);
   EXPECT_TRUE(bridge::InitFromSurface([empty] { return empty; }, 4, 4));  // takes our reference
   EXPECT_TRUE(log.Contains("Vexel: The size of the window is negative", ocr::log::kError));
-  EXPECT_FALSE(Handler().HasRenderer());
-}
-
-TEST_F(RendererBridgeTest, InitFailureIsLoggedWithItsReasonAndReturnsFalse) {
-  ocr::log::ScopedCapture log;
-  vexel_recording::FailOn("Renderer");
+  bridge::ShutDown();
+  vexel_recording::Failures() = {"Renderer"};
   EXPECT_FALSE(Init());
   EXPECT_TRUE(log.Contains("Vexel: initFromSurface() ERROR: recording kit: Renderer fails as asked",
                            ocr::log::kError));
-  EXPECT_FALSE(Handler().HasRenderer());
-  // The next frame does nothing.
-  HostFrame frame;
-  vexel_recording::ClearJournal();
-  Render(frame);
-  EXPECT_TRUE(vexel_recording::Journal().empty());
+  EXPECT_FALSE(Instance().HasRenderer());
 }
 
-TEST_F(RendererBridgeTest, FrameDrawsEachTextAtItsMappedPlace) {
-  ASSERT_TRUE(Init());  // 320x180 image in a 640x480 window: 640x360, rows 60..420
+TEST_F(RendererBridgeTest, AFrameDrawsEachTextAtItsMappedPlaceInItsCorrectedColour) {
+  ASSERT_TRUE(Init());
   HostFrame frame;
-  frame.Add("Exit", {80.0, 45.0, 40.0, 10.0, 0.0}, 7, static_cast<std::int32_t>(0xFF102030u));
-  frame.Add("Ausgang", {160.0, 90.0, 60.0, 12.0, -30.0}, 8);
-  cv::Mat image(kImageHeight, kImageWidth, CV_8UC4, cv::Scalar::all(50));
-  Render(frame, &image);
+  frame.Add("Exit", {80, 45, 40, 10, 0}, 7, 0xFF0A1464u).Add("Ausgang", {160, 90, 60, 12, -30}, 8);
+  frame.scales = {2.0, 20.0, 0.5, 1.0, 1.0, 1.0};
+  frame.shifts = {10.0, 0.0, -20.0, 0.0, 0.0, 0.0};
+  ocr::log::ScopedCapture log;
+  Render(frame, &image_);
+  EXPECT_EQ(log.Count(FrameLine(image_, 2), ocr::log::kInfo), 1);
   EXPECT_TRUE(bridge::GetRenderTranslate());
+  EXPECT_EQ(CountEntries("Texture.setImage RenderTexture 320 180 8"), 1);
+  EXPECT_EQ(CountEntries("Kit.drawAll"), 1);
 
   const InpaintedTextObject& exit = Current("Exit");
-  const auto& patch = NodeState(*exit.patch.object);
-  // Image (80, 45) -> window (160, 150) -> camera (-160, 90); sides x2.
-  EXPECT_NEAR(patch.position.x, -160.0f, 1e-3f);
-  EXPECT_NEAR(patch.position.y, 90.0f, 1e-3f);
-  EXPECT_NEAR(patch.scale.x, 40.0f * 2.0f * 1.05f, 1e-3f);
-  EXPECT_NEAR(patch.scale.y, 20.0f, 1e-3f);
+  const Vexel::Object& patch = *exit.patch.object;
+  // Image (80, 45) -> window (160, 150) -> camera (-160, 90); sides x2, the
+  // patch 5% wider.
+  EXPECT_NEAR(patch.getPosition().x, -160.0f, 1e-3f);
+  EXPECT_NEAR(patch.getPosition().y, 90.0f, 1e-3f);
+  EXPECT_NEAR(patch.getScale().x, 84.0f, 1e-3f);
+  EXPECT_NEAR(patch.getScale().y, 20.0f, 1e-3f);
   EXPECT_EQ(exit.patch.id, 7);
-  EXPECT_EQ(exit.slot_index, 0u);
-  EXPECT_EQ(NodeState(*exit.text).color, Vexel::Color::fromBytes(0x30, 0x20, 0x10));
-
-  const InpaintedTextObject& ausgang = Current("Ausgang");
-  EXPECT_EQ(ausgang.slot_index, 1u);
-  EXPECT_NEAR(NodeState(*ausgang.patch.object).rotation, 30.0f, 1e-4f);
-  EXPECT_NEAR(NodeState(*ausgang.patch.object).position.x, 0.0f, 1e-3f);
-  EXPECT_EQ(StateOf(*Handler().GetBackgroundTexture()).upload_count, 1);
-  EXPECT_EQ(CountEntries("Kit.drawAll"), 1);
+  // Channels (100, 20, 10) from the lowest byte up, scaled, shifted, clamped.
+  EXPECT_EQ(exit.text->getColor(), Vexel::Color::fromBytes(210, 255, 0));
+  EXPECT_EQ(vexel_recording::UniformsOf(*patch.getMaterial(0)).at("colorScale"),
+            Vexel::Vector3(2.0f, 20.0f, 0.5f));
+  EXPECT_NEAR(Current("Ausgang").patch.object->getRotation().valueDegrees(), 30.0f, 1e-4f);
 }
 
-TEST_F(RendererBridgeTest, TextColourIsCorrectedLikeItsPatch) {
+TEST_F(RendererBridgeTest, AnEmptyFrameKeepsTheTextsForReuseAndStillDrawsTheBackground) {
   ASSERT_TRUE(Init());
-  HostFrame frame;
-  frame.Add("Exit", {80.0, 45.0, 40.0, 10.0, 0.0}, 7, static_cast<std::int32_t>(0xFF646464u));
-  frame.scales = {2.0, 3.0, 0.5};
-  frame.shifts = {10.0, 0.0, -20.0};
-  Render(frame);
-  EXPECT_EQ(NodeState(*Current("Exit").text).color, Vexel::Color::fromBytes(210, 255, 30));
-  const auto& material = StateOf(*Current("Exit").patch.object->getMaterial(0));
-  EXPECT_EQ(material.vector_uniforms.at("colorScale").second, Vexel::Vector3(2.0f, 3.0f, 0.5f));
-}
-
-TEST_F(RendererBridgeTest, EmptyFrameClearsTextsButStillDrawsTheBackground) {
-  ASSERT_TRUE(Init());
-  HostFrame frame;
-  frame.Add("Exit", {80.0, 45.0, 40.0, 10.0, 0.0}, 7);
-  Render(frame);
-  HostFrame empty;
-  cv::Mat image(kImageHeight, kImageWidth, CV_8UC4);
-  vexel_recording::ClearJournal();
-  Render(empty, &image);
+  HostFrame frame, empty;
+  Render(frame.Add("Exit"));
+  Journal().clear();
+  Render(empty, &image_);
   EXPECT_FALSE(bridge::GetRenderTranslate());
-  EXPECT_EQ(CountEntries("setImage RenderTexture 320x180"), 1);
-  EXPECT_EQ(CountEntries("Kit.drawAll"), 1);
-  EXPECT_EQ(Handler().GetReusableTextCache().count("Exit"), 1u);  // kept for reuse
-  EXPECT_EQ(Handler().GetTextNodes()[0]->getParent(), nullptr);
+  EXPECT_EQ(Journal(), (std::vector<std::string>{"Texture.setImage RenderTexture 320 180 8",
+                                                 "Node.removeChild", "Kit.drawAll"}));
+  EXPECT_EQ(Cached("Exit"), 1u);
 }
 
-TEST_F(RendererBridgeTest, UnreadableTextStillTakesItsSlot) {
+TEST_F(RendererBridgeTest, AnUnreadableTextStillTakesItsSlotEmptyBlackAndUncorrected) {
   ASSERT_TRUE(Init());
   HostFrame frame;
-  frame.Add(std::nullopt, {80.0, 45.0, 40.0, 10.0, 0.0}, 7, 0x7F00FF00);
-  frame.Add("zwei", {80.0, 45.0, 40.0, 10.0, 0.0}, 8);
+  frame.Add(std::nullopt, {80, 45, 40, 10, 0}, 7, 0x7F00FF00u).Add("zwei");
   ocr::log::ScopedCapture log;
   Render(frame);
-  EXPECT_TRUE(log.Contains("Vexel: GetStringUTFChars failed.", ocr::log::kError));
+  EXPECT_EQ(log.Texts(), (std::vector<std::string>{FrameLine(cv::Mat(), 2),
+                                                   "Vexel: GetStringUTFChars failed."}));
   const InpaintedTextObject& empty = Current("");
   EXPECT_EQ(empty.slot_index, 0u);
   EXPECT_EQ(empty.patch.id, -1);
-  EXPECT_EQ(NodeState(*empty.text).color, Vexel::Color(0, 0, 0, 1));
-  EXPECT_EQ(NodeState(*empty.patch.object).scale.x, 0.0f);
+  EXPECT_EQ(empty.text->getColor(), Vexel::Color(0, 0, 0, 1));
+  EXPECT_EQ(empty.patch.object->getScale().x, 0.0f);
+  const auto& uniforms = vexel_recording::UniformsOf(*empty.patch.object->getMaterial(0));
+  EXPECT_EQ(uniforms.at("colorScale"), Vexel::Vector3(1, 1, 1));
+  EXPECT_EQ(uniforms.at("colorShift"), Vexel::Vector3(0, 0, 0));
   EXPECT_EQ(Current("zwei").slot_index, 1u);
 }
 
 TEST_F(RendererBridgeTest, EachFailingCallIsLoggedAndTheFrameGoesOn) {
   ASSERT_TRUE(Init());
-  HostFrame frame;
-  frame.Add("eins", {80.0, 45.0, 40.0, 10.0, 0.0}, 1);
-  frame.Add("zwei", {80.0, 45.0, 40.0, 10.0, 0.0}, 2);
-  cv::Mat image(kImageHeight, kImageWidth, CV_8UC4);
+  HostFrame two, one, none;
+  two.Add("eins").Add("zwei");
   ocr::log::ScopedCapture log;
-  vexel_recording::FailOn("setImage");
-  vexel_recording::FailOn("Kit.drawAll");
-  vexel_recording::FailOn("Text.setText");
-  Render(frame, &image);
+  vexel_recording::Failures() = {"Texture.setImage", "Kit.drawAll", "Text"};
+  Render(two, &image_);
   EXPECT_EQ(log.Count("Vexel: Caught exception in SceneHandler::UpdateBackgroundImage.",
                       ocr::log::kError),
             1);
@@ -270,15 +161,12 @@ TEST_F(RendererBridgeTest, EachFailingCallIsLoggedAndTheFrameGoesOn) {
   EXPECT_EQ(log.Count("Vexel: Caught exception in SceneHandler::RenderOneFrame.", ocr::log::kError),
             1);
 
-  vexel_recording::ClearFailures();
-  Render(frame);
+  vexel_recording::Failures().clear();
+  Render(two);
   // Slot 1 must leave the scene when only one text comes.
-  vexel_recording::FailOn("Node.removeChild");
-  HostFrame one;
-  one.Add("eins", {80.0, 45.0, 40.0, 10.0, 0.0}, 1);
-  Render(one);
-  HostFrame empty;
-  Render(empty);
+  vexel_recording::Failures() = {"Node.removeChild"};
+  Render(one.Add("eins"));
+  Render(none);
   // ClearAllTextObjects catches by itself; ClearTextObjects does not.
   EXPECT_EQ(log.Count("Vexel: Caught exception clearing remaining text objects.", ocr::log::kError),
             1);
@@ -286,79 +174,47 @@ TEST_F(RendererBridgeTest, EachFailingCallIsLoggedAndTheFrameGoesOn) {
             1);
 }
 
-TEST_F(RendererBridgeTest, LanguageCallsAreGuarded) {
-  ASSERT_TRUE(Init());
-  ocr::log::ScopedCapture log;
-  vexel_recording::FailOn("Font");
-  bridge::SetTranslationLanguage("zh-CHS");
-  EXPECT_TRUE(log.Contains("Vexel: set translation language: zh-CHS", ocr::log::kInfo));
-  EXPECT_TRUE(log.Contains("Vexel: caught exception from SceneHandler::SetTranslationLanguage.",
-                           ocr::log::kError));
-  vexel_recording::ClearFailures();
-
-  bridge::SetTranslationLanguageFont("de", "/system/fonts/Roboto.ttf");
-  EXPECT_TRUE(log.Contains(
-      "Vexel: set translation language de to use font: /system/fonts/Roboto.ttf", ocr::log::kInfo));
-  EXPECT_EQ(Handler().GetLanguageFonts().at("de"), "/system/fonts/Roboto.ttf");
-  bridge::SetTranslationLanguageFont("de", "");
-  EXPECT_TRUE(Handler().GetLanguageFonts().empty());
-  bridge::SetTranslationLanguageFont("de", nullptr);
-  EXPECT_TRUE(log.Contains("Vexel: set translation language de to use font: ", ocr::log::kInfo));
-}
-
-TEST_F(RendererBridgeTest, OrientationRebuildsTheBackgroundAndTurnsTheRectangles) {
-  ASSERT_TRUE(Init());
-  HostFrame frame;
-  frame.Add("Exit", {80.0, 45.0, 40.0, 10.0, 0.0}, 7);
-  Render(frame);
-  ocr::log::ScopedCapture log;
-  bridge::SetOrientation(90);
-  EXPECT_TRUE(log.Contains("Vexel: Set renderer orientation 90.", ocr::log::kInfo));
-  EXPECT_TRUE(log.Contains("VexelJNI::InitBackground rotation = 90 \r\n", ocr::log::kDebug));
-  // The host's frames now stand upright: 180 wide, 320 tall.
-  EXPECT_EQ(Handler().GetBackgroundWidth(), kImageHeight);
-  EXPECT_EQ(Handler().GetBackgroundHeight(), kImageWidth);
-  EXPECT_EQ(Handler().GetReusableTextCache().count("Exit"), 1u);  // cleared, not forced
-
-  // Upright image point (45, 240) shows at background (240, 135): window
-  // (480, 330), camera (160, -90); the angle turns by -90 (camera +90).
-  HostFrame turned;
-  turned.Add("Exit", {45.0, 240.0, 40.0, 10.0, 0.0}, 7);
-  Render(turned);
-  const auto& patch = NodeState(*Current("Exit").patch.object);
-  EXPECT_NEAR(patch.position.x, 160.0f, 1e-3f);
-  EXPECT_NEAR(patch.position.y, -90.0f, 1e-3f);
-  EXPECT_NEAR(patch.rotation, 90.0f, 1e-4f);
-  EXPECT_NEAR(patch.scale.x, 84.0f, 1e-3f);
-  EXPECT_NEAR(patch.scale.y, 20.0f, 1e-3f);
-}
-
 TEST_F(RendererBridgeTest, ShortRectangleArraysAreReportedAndDrawnEmpty) {
   ASSERT_TRUE(Init());
   HostFrame frame;
-  frame.Add("eins", {80.0, 45.0, 40.0, 10.0, 0.0}, 1);
-  frame.Add("zwei", {80.0, 45.0, 40.0, 10.0, 0.0}, 2);
-  frame.text_rects.resize(5);
+  frame.Add("eins").Add("zwei").text_rects.resize(5);
   ocr::log::ScopedCapture log;
   Render(frame);
   EXPECT_EQ(log.Count("Vexel: renderOneFrame needs 5 values per text in patchRects and "
                       "textRects; missing rectangles are drawn empty.",
                       ocr::log::kError),
             1);
-  EXPECT_EQ(NodeState(*Current("zwei").text).scale.x, 0.0f);
+  EXPECT_EQ(Current("zwei").text->getScale().x, 0.0f);
 }
 
-TEST_F(RendererBridgeTest, LogsEachFrameWithImageAndTextCount) {
+TEST_F(RendererBridgeTest, LanguageAndOrientationCallsAreLoggedAndGuarded) {
   ASSERT_TRUE(Init());
-  cv::Mat image(kImageHeight, kImageWidth, CV_8UC4);
-  HostFrame frame;
-  frame.Add("eins", {80.0, 45.0, 40.0, 10.0, 0.0}, 1);
   ocr::log::ScopedCapture log;
-  Render(frame, &image);
-  char expected[128];
-  std::snprintf(expected, sizeof(expected), "Vexel: renderOneFrame image(%p %d %d) text(%d)",
-                static_cast<void*>(image.data), kImageWidth, kImageHeight, 1);
-  EXPECT_EQ(log.Count(expected, ocr::log::kInfo), 1);
+  vexel_recording::Failures() = {"Font"};
+  bridge::SetTranslationLanguage("zh-CHS");
+  EXPECT_TRUE(log.Contains("Vexel: set translation language: zh-CHS", ocr::log::kInfo));
+  EXPECT_TRUE(log.Contains("Vexel: caught exception from SceneHandler::SetTranslationLanguage.",
+                           ocr::log::kError));
+  bridge::SetTranslationLanguageFont("de", "/system/fonts/Roboto.ttf");
+  EXPECT_TRUE(log.Contains(
+      "Vexel: set translation language de to use font: /system/fonts/Roboto.ttf", ocr::log::kInfo));
+  EXPECT_EQ(Instance().GetLanguageFonts().at("de"), "/system/fonts/Roboto.ttf");
+  bridge::SetTranslationLanguageFont("de", nullptr);
+  EXPECT_TRUE(log.Contains("Vexel: set translation language de to use font: ", ocr::log::kInfo));
+  EXPECT_TRUE(Instance().GetLanguageFonts().empty());
+
+  // A new orientation rebuilds the background with the host's frames
+  // standing the other way round.
+  vexel_recording::Failures() = {"Mesh"};
+  bridge::SetOrientation(90);
+  EXPECT_TRUE(
+      log.Contains("Vexel: caught unexpected exception in ResetBackground.", ocr::log::kError));
+  vexel_recording::Failures().clear();
+  bridge::SetOrientation(90);
+  EXPECT_TRUE(log.Contains("VexelJNI::InitBackground rotation = 90 \r\n", ocr::log::kDebug));
+  EXPECT_EQ(Instance().GetBackgroundWidth(), 180);
+  EXPECT_EQ(Instance().GetBackgroundHeight(), 320);
+  bridge::SetOrientation(0);  // the orientation outlives the renderer
 }
 
 }  // namespace

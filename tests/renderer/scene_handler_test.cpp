@@ -3,16 +3,20 @@
 #include "common/log.h"
 #include "recording_scene.h"
 
-namespace ocr_ar {
+namespace ocr_ar::testing {
 namespace {
 
-using testing::RecordingScene;
-using vexel_recording::CountEntries;
-using vexel_recording::FindEntry;
-using vexel_recording::LiveCount;
-using vexel_recording::NodeState;
+using SceneHandlerTest = RecordingScene;
 
-class SceneHandlerTest : public RecordingScene {};
+// The fonts built so far: "Font <name> <file type> <antialiased>".
+std::vector<std::string> FontsMade() {
+  std::vector<std::string> fonts;
+  for (const std::string& entry : Journal()) {
+    if (entry.rfind("Font ", 0) == 0)
+      fonts.push_back(entry);
+  }
+  return fonts;
+}
 
 TEST_F(SceneHandlerTest, InstanceIsASingletonRebuiltFreshAfterDelete) {
   SceneHandler* first = SceneHandler::Instance();
@@ -21,223 +25,158 @@ TEST_F(SceneHandlerTest, InstanceIsASingletonRebuiltFreshAfterDelete) {
   first->SetTranslationLanguageFont("de", "x.ttf");
   SceneHandler::DeleteInstance();
   SceneHandler::DeleteInstance();  // harmless twice
-
   SceneHandler* fresh = SceneHandler::Instance();
   EXPECT_EQ(fresh->GetTranslationLanguage(), "");
   EXPECT_TRUE(fresh->GetLanguageFonts().empty());
-  EXPECT_TRUE(fresh->GetCurrentTextCache().empty());
-  EXPECT_TRUE(fresh->GetReusableTextCache().empty());
-  EXPECT_FALSE(fresh->HasRenderer());
-  EXPECT_EQ(fresh->GetFont(), nullptr);
+  std::vector<float> corners(4);
+  fresh->GetBackgroundRectCorners(&corners[0], &corners[1], &corners[2], &corners[3]);
+  EXPECT_EQ(corners, std::vector<float>(4, 1.0f));
 }
 
-TEST_F(SceneHandlerTest, BackgroundCornersStartAtOne) {
-  float l = 0, t = 0, r = 0, b = 0;
-  SceneHandler::Instance()->GetBackgroundRectCorners(&l, &t, &r, &b);
-  EXPECT_EQ(l, 1.0f);
-  EXPECT_EQ(t, 1.0f);
-  EXPECT_EQ(r, 1.0f);
-  EXPECT_EQ(b, 1.0f);
-  SceneHandler::Instance()->SetBackgroundRectCorners(-1.0f, 0.5f, 1.0f, -0.5f);
-  SceneHandler::Instance()->GetBackgroundRectCorners(&l, &t, &r, &b);
-  EXPECT_EQ(t, 0.5f);
-  EXPECT_EQ(b, -0.5f);
-}
-
-TEST_F(SceneHandlerTest, InitBuildsKitRendererSceneAndOrthographicCamera) {
-  SceneHandler& handler = Handler();
+TEST_F(SceneHandlerTest, InitBuildsKitRendererSceneCameraThenAppliesTheStoredLanguage) {
+  SceneHandler::Instance()->SetTranslationLanguage("ja");  // stored only
+  EXPECT_TRUE(Journal().empty());
   const std::vector<std::string> order = {"Kit Vexel.log",
                                           "Renderer 0",
                                           "Scene",
-                                          "Scene.setBackgroundColor",
-                                          "Scene.setShadowEnabled false",
                                           "Camera",
-                                          "Camera.setProjectionMode 1",
-                                          "Renderer.setScene"};
-  EXPECT_EQ(vexel_recording::Journal(), order);
-
-  EXPECT_EQ(handler.GetScene()->getBackgroundColor(), Vexel::Color(0, 0, 0, 0));
-  Vexel::Camera& camera = *handler.GetCamera();
-  EXPECT_EQ(camera.getParent(), Root(handler));
-  EXPECT_EQ(camera.getProjectionMode(), Vexel::PROJECTION_ORTHOGRAPHIC);
-  EXPECT_EQ(camera.getOrthographicWindowWidth(), 640.0f);
-  EXPECT_EQ(camera.getOrthographicWindowHeight(), 480.0f);
-  EXPECT_FALSE(camera.isAutomaticAspectRatio());
-  EXPECT_EQ(camera.getNearClipDistance(), 1.0f);
-  EXPECT_EQ(camera.getFarClipDistance(), 300.0f);
-  float w = 0, h = 0;
-  handler.GetOrthoCameraWidthHeight(&w, &h);
-  EXPECT_EQ(w, 640.0f);
-  EXPECT_EQ(h, 480.0f);
-}
-
-TEST_F(SceneHandlerTest, InitAgainReplacesEachObjectAfterBuildingItsSuccessor) {
-  SceneHandler& handler = Handler();
-  vexel_recording::ClearJournal();
-  handler.Init(window_, nullptr, 320, 200, {}, {});
-  const auto& journal = vexel_recording::Journal();
-  EXPECT_LT(FindEntry("Kit Vexel.log"), FindEntry("~Kit"));
-  EXPECT_LT(FindEntry("Renderer 0"), FindEntry("~Renderer"));
-  EXPECT_LT(FindEntry("Scene"), FindEntry("~Scene"));
-  EXPECT_EQ(CountEntries("Camera"), 1);
-  EXPECT_EQ(CountEntries("~Camera"), 1);
-  EXPECT_EQ(LiveCount("Kit"), 1);
-  EXPECT_EQ(LiveCount("Scene"), 1);
-  EXPECT_EQ(LiveCount("Camera"), 1);
-  EXPECT_EQ(handler.GetCamera()->getOrthographicWindowWidth(), 320.0f);
-  EXPECT_FALSE(journal.empty());
-}
-
-TEST_F(SceneHandlerTest, InitReappliesTheStoredLanguageOnceTheCameraExists) {
-  SceneHandler* handler = SceneHandler::Instance();
-  handler->SetTranslationLanguage("ja");  // before Init: stored only
-  EXPECT_EQ(CountEntries("Font*"), 0);
-  handler->Init(window_, nullptr, kWidth, kHeight, {}, {});
-  EXPECT_LT(FindEntry("Camera"), FindEntry("Font NotoSansCJK-Regular.ttc 2"));
-  ASSERT_NE(handler->GetFont(), nullptr);
-  EXPECT_EQ(handler->GetFont()->getReferenceCharacter(), 0xFF41u);
+                                          "Camera.setOrthographicWindowSize 640 480",
+                                          "Font NotoSansCJK-Regular.ttc 2 true"};
+  Handler();
+  EXPECT_EQ(Journal(), order);
+  EXPECT_EQ(Handler().GetFont()->getReferenceCharacter(), 0xFF41u);
+  EXPECT_EQ(Handler().GetCamera()->getParent(), Root());
 }
 
 TEST_F(SceneHandlerTest, DestructionGoesChildrenFirstThenSceneRendererKit) {
   Handler().CreateBackground(640, 480, 0, -1, 1, 1, -1);
   Draw(0, "Hallo", 1);
-  vexel_recording::ClearJournal();
+  Journal().clear();
   SceneHandler::DeleteInstance();
-
-  const int text = FindEntry("~Text Hallo");
-  const int camera = FindEntry("~Camera");
-  const int material = FindEntry("~Material", camera);  // the background's
-  const int texture = FindEntry("~Texture RenderTexture");
-  const int mesh = FindEntry("~Mesh BackgroundRectMesh");
-  const int font = FindEntry("~Font NotoSansCJK-Regular.ttc");
-  const int shared_mesh = FindEntry("~Mesh InpaintedRectMesh");
-  const int scene = FindEntry("~Scene");
-  const int renderer = FindEntry("~Renderer");
-  const int kit = FindEntry("~Kit");
-  for (int index : {text, camera, material, texture, mesh, font, shared_mesh, scene, renderer, kit})
-    ASSERT_GE(index, 0);
-  EXPECT_LT(text, camera);
-  EXPECT_LT(camera, material);
-  EXPECT_LT(material, texture);
-  EXPECT_LT(texture, mesh);
-  EXPECT_LT(mesh, font);
-  EXPECT_LT(font, shared_mesh);
-  EXPECT_LT(shared_mesh, scene);
-  EXPECT_LT(scene, renderer);
-  EXPECT_LT(renderer, kit);
+  int at = 0;
+  for (const char* entry : {"~Text", "~Camera", "~Material", "~Texture RenderTexture",
+                            "~Mesh BackgroundRectMesh", "~Font NotoSansCJK-Regular.ttc 2 true",
+                            "~Mesh InpaintedRectMesh", "~Scene", "~Renderer 0", "~Kit Vexel.log"}) {
+    const int found = FindEntry(entry, at);
+    ASSERT_GE(found, 0) << entry << " missing or out of order";
+    at = found + 1;
+  }
   for (const char* type : {"Kit", "Renderer", "Scene", "Camera", "Texture", "Material", "Mesh",
-                           "Object", "Font", "Text", "EmptyNode"}) {
+                           "Object", "Font", "Text"}) {
     EXPECT_EQ(LiveCount(type), 0) << type;
   }
 }
 
-TEST_F(SceneHandlerTest, WithoutSceneCameraAndClearingDoNothing) {
-  SceneHandler& handler = *SceneHandler::Instance();
-  ocr::log::ScopedCapture log;
-  handler.DeleteCamera();
-  handler.ClearTextObjects(0, true);
-  handler.ClearAllTextObjects(true);
-  handler.RenderOneFrame();
-  EXPECT_TRUE(vexel_recording::Journal().empty());
-  EXPECT_TRUE(log.Texts().empty());
-}
-
-TEST_F(SceneHandlerTest, ClearAllOnAnEmptySceneLogsNothing) {
-  SceneHandler& handler = Handler();
-  ocr::log::ScopedCapture log;
-  handler.ClearAllTextObjects(false);
-  handler.ClearAllTextObjects(true);
-  EXPECT_TRUE(log.Texts().empty());
-  EXPECT_EQ(Root(handler)->getChildCount(), 1u);  // the camera
-}
-
 TEST_F(SceneHandlerTest, AnUnusedTextIsKeptFor249PassesAndRetiredOnThe250th) {
-  SceneHandler& handler = Handler();
-  Draw(0, "Ausgang", 5);
-  const Vexel::Text* text = handler.GetCurrentTextCache().at("Ausgang").front().text.get();
-  handler.UpdateTextObjectCache();
+  Draw(0, "Ausgang", 5, true);
+  const Vexel::Text* text = Current("Ausgang").text.get();
+  Handler().UpdateTextObjectCache();
   for (int pass = 1; pass <= 249; ++pass)
-    handler.ClearTextObjects(0, false);
-  ASSERT_EQ(CachedCount(handler.GetReusableTextCache(), "Ausgang"), 1u);
-  EXPECT_EQ(handler.GetUnusedFrameCount(text), 249);
+    Handler().ClearTextObjects(0, false);
+  ASSERT_EQ(Cached("Ausgang"), 1u);
+  EXPECT_EQ(Handler().GetUnusedFrameCount(text), 249);
   EXPECT_EQ(LiveCount("Text"), 1);
 
-  handler.ClearTextObjects(0, false);
-  EXPECT_EQ(handler.GetReusableTextCache().count("Ausgang"), 0u);  // key erased too
-  EXPECT_EQ(handler.GetUnusedFrameCount(text), -1);
-  EXPECT_EQ(LiveCount("Text"), 0);
-  EXPECT_EQ(LiveCount("Texture"), 0);
-  EXPECT_EQ(LiveCount("Object"), 0);
-  EXPECT_EQ(LiveCount("Material"), 0);
+  Handler().ClearTextObjects(0, false);
+  EXPECT_EQ(Handler().GetReusableTextCache().count("Ausgang"), 0u);  // the key goes too
+  EXPECT_EQ(Handler().GetUnusedFrameCount(text), -1);
+  for (const char* type : {"Text", "Texture", "Object", "Material"})
+    EXPECT_EQ(LiveCount(type), 0) << type;
 }
 
-TEST_F(SceneHandlerTest, ForcedClearingRetiresAtOnce) {
-  SceneHandler& handler = Handler();
-  Draw(0, "Eingang");
-  handler.UpdateTextObjectCache();
-  handler.ClearTextObjects(0, true);
-  EXPECT_TRUE(handler.GetReusableTextCache().empty());
-  EXPECT_EQ(LiveCount("Text"), 0);
-}
-
-TEST_F(SceneHandlerTest, ObjectsInDrawnSlotsAreKeptEvenWhenForced) {
-  SceneHandler& handler = Handler();
+TEST_F(SceneHandlerTest, ForcedClearingRetiresAtOnceAllButTheDrawnSlots) {
   Draw(0, "eins");
   Draw(1, "zwei");
-  handler.UpdateTextObjectCache();
-  handler.ClearTextObjects(1, true);  // slot 0 counts as drawn
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "eins"), 1u);
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "zwei"), 0u);
-}
+  Handler().UpdateTextObjectCache();
+  Handler().ClearTextObjects(1, true);  // slot 0 counts as drawn
+  EXPECT_EQ(Cached("eins"), 1u);
+  EXPECT_EQ(Cached("zwei"), 0u);
+  EXPECT_EQ(LiveCount("Text"), 1);
 
-TEST_F(SceneHandlerTest, ClearAllRetiresTheCurrentFrameToo) {
-  SceneHandler& handler = Handler();
+  // Clearing all detaches every slot, keeping the current frame's texts
+  // cached; forced, it retires them too.
+  Draw(1, "drei");
+  Handler().ClearAllTextObjects(false);
+  EXPECT_EQ(Cached("drei"), 1u);
+  EXPECT_EQ(Slot(0)->getParent(), nullptr);
+  EXPECT_EQ(Slot(1)->getParent(), nullptr);
   Draw(0, "eins");
-  handler.UpdateTextObjectCache();
-  Draw(0, "zwei");  // current frame
-  handler.ClearAllTextObjects(true);
-  EXPECT_TRUE(handler.GetCurrentTextCache().empty());
-  EXPECT_TRUE(handler.GetReusableTextCache().empty());
+  Handler().ClearAllTextObjects(true);
+  EXPECT_TRUE(Handler().GetCurrentTextCache().empty());
+  EXPECT_TRUE(Handler().GetReusableTextCache().empty());
   EXPECT_EQ(LiveCount("Text"), 0);
 }
 
-TEST_F(SceneHandlerTest, ClearAllUnforcedKeepsTextsCachedButDetachesTheirSlots) {
-  SceneHandler& handler = Handler();
-  Draw(0, "eins");
-  Draw(1, "zwei");
-  ASSERT_EQ(handler.GetTextNodes()[1]->getParent(), Root(handler));
-  handler.ClearAllTextObjects(false);
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "eins"), 1u);
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "zwei"), 1u);
-  EXPECT_EQ(handler.GetTextNodes()[0]->getParent(), nullptr);
-  EXPECT_EQ(handler.GetTextNodes()[1]->getParent(), nullptr);
-}
-
-TEST_F(SceneHandlerTest, ClearAllCatchesLogsAndReturns) {
-  SceneHandler& handler = Handler();
-  Draw(0, "eins");
-  handler.UpdateTextObjectCache();
+TEST_F(SceneHandlerTest, ClearingAllCatchesLogsAndReturns) {
   ocr::log::ScopedCapture log;
-  vexel_recording::FailOn("Node.removeChild");
-  handler.ClearAllTextObjects(true);
-  EXPECT_EQ(log.Texts(),
+  Handler().ClearAllTextObjects(true);  // nothing to clear: nothing logged
+  Draw(0, "eins");
+  vexel_recording::Failures() = {"Node.removeChild"};
+  Handler().ClearAllTextObjects(true);
+  ASSERT_EQ(log.Texts(),
             std::vector<std::string>{"SceneHandler: caught exception in ClearAllTextObjects."});
   EXPECT_EQ(log.Records()[0].priority, ocr::log::kError);
 }
 
-TEST_F(SceneHandlerTest, UpdateTextObjectCacheSplicesUnderTheSameKey) {
-  SceneHandler& handler = Handler();
-  Draw(0, "gleich", 1);
-  handler.UpdateTextObjectCache();
-  Draw(0, "gleich", 1);  // reused
-  Draw(1, "gleich", 2);  // a second object with the same text
-  EXPECT_EQ(CachedCount(handler.GetCurrentTextCache(), "gleich"), 2u);
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "gleich"), 0u);
-  handler.UpdateTextObjectCache();
-  EXPECT_TRUE(handler.GetCurrentTextCache().empty());
-  EXPECT_EQ(CachedCount(handler.GetReusableTextCache(), "gleich"), 2u);
-  EXPECT_EQ(LiveCount("Text"), 2);
+TEST_F(SceneHandlerTest, DefaultFontsAreBuiltOnlyWhenTheLanguageNeedsAnotherOne) {
+  Handler().SetTranslationLanguage("en");
+  Draw(0, "Exit");
+  Handler().SetTranslationLanguage("en");
+  Handler().SetTranslationLanguage("ja");  // the same default font: kept, texts too
+  EXPECT_EQ(LiveCount("Text"), 1);
+  EXPECT_EQ(Handler().GetFont()->getReferenceCharacter(), 0u);  // only a new font gets it
+  Handler().SetTranslationLanguage("zh-CHS");  // another font: every text retired first
+  EXPECT_EQ(LiveCount("Text"), 0);
+  EXPECT_EQ(Handler().GetFont()->getReferenceCharacter(), 0xFF41u);
+  Draw(0, "出口");
+  Handler().SetTranslationLanguage("ko");
+  EXPECT_EQ(LiveCount("Text"), 0);
+  EXPECT_EQ(FontsMade(), (std::vector<std::string>{"Font NotoSansCJK-Regular.ttc 2 true",
+                                                   "Font NoriChinese-Medium.ttf 2 true",
+                                                   "Font NotoSansCJK-Regular.ttc 2 true"}));
+  EXPECT_EQ(LiveCount("Font"), 1);
+}
+
+TEST_F(SceneHandlerTest, MappedFontsReplaceTheCurrentOneWithoutClearingTexts) {
+  Handler().SetTranslationLanguage("en");
+  Draw(0, "Exit");
+  const std::pair<const char*, const char*> cases[] = {
+      {"fonts/Custom.ttf", "Font fonts/Custom.ttf 2 true"},
+      {"/system/fonts/Roboto-Regular.ttf", "Font Roboto-Regular.ttf 1 true"},
+      {"/data/system/fonts/Nanum.ttf", "Font /data/system/fonts/Nanum.ttf 2 true"}};
+  for (const auto& [path, font] : cases) {
+    Handler().SetTranslationLanguageFont("en", path);
+    EXPECT_NE(FontsMade().back(), font);  // not before the language is set again
+    Handler().SetTranslationLanguage("en");
+    Handler().SetTranslationLanguage("en");  // the same font again: not rebuilt
+    EXPECT_EQ(FontsMade().back(), font);
+  }
+  EXPECT_EQ(FontsMade().size(), 4u);
+  EXPECT_EQ(LiveCount("Text"), 1);  // never cleared, unlike a change of default font
+
+  // Back to the default font: only the entry goes unless the mapped font is
+  // current (a platform font's name lacks its path's prefix: never current).
+  Handler().SetTranslationLanguageFont("de", "/system/fonts/Roboto-Regular.ttf");
+  Handler().SetTranslationLanguage("de");
+  Handler().SetTranslationLanguageUseDefaultFont("de");
+  Handler().SetTranslationLanguageUseDefaultFont("fr");  // no entry
+  EXPECT_EQ(Handler().GetFont()->getName(), "Roboto-Regular.ttf");
+  EXPECT_EQ(LiveCount("Text"), 1);
+  Handler().SetTranslationLanguage("en");
+  Handler().SetTranslationLanguageUseDefaultFont("en");
+  EXPECT_TRUE(Handler().GetLanguageFonts().empty());
+  EXPECT_EQ(Handler().GetFont()->getName(), "NotoSansCJK-Regular.ttc");
+  EXPECT_EQ(LiveCount("Text"), 0);
+}
+
+TEST_F(SceneHandlerTest, TextsAreNormalisedExceptInTheBoldCjkFace) {
+  Draw(0, "Exit");
+  Handler().SetTranslationLanguageFont("ja", "/system/fonts/NotoSansCJK-Bold.ttc");
+  Handler().SetTranslationLanguage("ja");
+  Draw(1, "非常口");
+  EXPECT_EQ(CountEntries("Text.normalizeText"), 1);
+  EXPECT_EQ(Handler().GetFont()->getReferenceCharacter(), 0xFF41u);
 }
 
 }  // namespace
-}  // namespace ocr_ar
+}  // namespace ocr_ar::testing
