@@ -32,7 +32,8 @@ else()
   set(platform_gl_libs ${EGL_LIBRARY} ${GLES2_LIBRARY})
 endif()
 
-add_library(vexel_platform_gl STATIC common/gl_device_shared.cpp ${platform_gl_sources})
+add_library(vexel_platform_gl STATIC common/gl_device_shared.cpp common/kit_log_path.cpp
+                                     ${platform_gl_sources})
 target_include_directories(vexel_platform_gl PUBLIC include PRIVATE common)
 target_link_libraries(vexel_platform_gl PUBLIC platform_ndk ${platform_gl_libs} ocr_platform_log)
 ocr_warnings(vexel_platform_gl)

@@ -4,26 +4,18 @@
 #include <filesystem>
 #include <system_error>
 
+#include "kit_log_directory.h"
 #include "platform/kit_files.h"
 
 namespace platform {
 
-std::string KitLogPath(const std::string& name) {
-  if (name.empty())
-    return {};
-  const std::filesystem::path file(name);
-  if (file.is_absolute())
-    return name;
+std::filesystem::path KitLogDirectory() {
   // An app's writable directories are known only to its Java side, which can
   // name one through this variable before the kit starts.
   const char* dir = std::getenv("VEXEL_LOG_DIR");
   if (dir == nullptr || dir[0] == '\0')
     return {};
-  std::error_code error;
-  std::filesystem::create_directories(dir, error);
-  if (error)
-    return {};
-  return (std::filesystem::path(dir) / file).string();
+  return dir;
 }
 
 void KitSystemLog(int priority, const std::string& text) {

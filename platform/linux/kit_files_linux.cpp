@@ -2,6 +2,7 @@
 #include <filesystem>
 #include <system_error>
 
+#include "kit_log_directory.h"
 #include "platform/kit_files.h"
 #include "platform/log_sink.h"
 
@@ -13,6 +14,10 @@ std::string Environment(const char* name) {
   return value != nullptr ? value : "";
 }
 
+const char* const kFontRoots[] = {"/usr/share/fonts", "/usr/local/share/fonts"};
+
+}  // namespace
+
 std::filesystem::path KitLogDirectory() {
   if (const std::string dir = Environment("VEXEL_LOG_DIR"); !dir.empty())
     return dir;
@@ -23,24 +28,6 @@ std::filesystem::path KitLogDirectory() {
   if (error)
     temp = "/tmp";
   return temp / "vexel";
-}
-
-const char* const kFontRoots[] = {"/usr/share/fonts", "/usr/local/share/fonts"};
-
-}  // namespace
-
-std::string KitLogPath(const std::string& name) {
-  if (name.empty())
-    return {};
-  const std::filesystem::path file(name);
-  if (file.is_absolute())
-    return name;
-  const std::filesystem::path directory = KitLogDirectory();
-  std::error_code error;
-  std::filesystem::create_directories(directory, error);
-  if (error)
-    return {};
-  return (directory / file).string();
 }
 
 void KitSystemLog(int priority, const std::string& text) {
