@@ -19,6 +19,12 @@ packages=(
   # text: glyphs, shaping, bidi, and fonts for Latin, CJK, Arabic, Hebrew
   libfreetype-dev libharfbuzz-dev libfribidi-dev libicu-dev
   fonts-noto-cjk fonts-wqy-microhei fonts-noto-core fonts-dejavu-core
+  # desktop host: OCR with its language data (osd: page orientation)
+  tesseract-ocr tesseract-ocr-eng tesseract-ocr-spa tesseract-ocr-cat tesseract-ocr-fra
+  tesseract-ocr-deu tesseract-ocr-osd
+  # desktop host: machine translation, every pair Debian has with English
+  apertium apertium-eng-spa apertium-eng-cat apertium-en-gl apertium-hbs-eng
+  apertium-isl-eng apertium-mkd-eng
 )
 
 missing=()

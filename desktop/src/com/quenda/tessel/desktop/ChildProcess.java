@@ -1,0 +1,88 @@
+package com.quenda.tessel.desktop;
+
+import java.io.ByteArrayOutputStream;
+import java.io.IOException;
+import java.io.InputStream;
+import java.io.OutputStream;
+import java.nio.charset.StandardCharsets;
+import java.util.List;
+import java.util.Map;
+import java.util.concurrent.TimeUnit;
+
+/**
+ * Runs an external program (OCR, translation) to completion: standard input written from a
+ * string, standard output and error collected, a time limit after which it is killed. The tools
+ * run in their own processes so that a crash or a hang in one of them cannot take the host down.
+ */
+public final class ChildProcess {
+  /** What a finished program left. */
+  public static final class Result {
+    public final int exitCode;
+    public final String stdout;
+    public final String stderr;
+
+    Result(int exitCode, String stdout, String stderr) {
+      this.exitCode = exitCode;
+      this.stdout = stdout;
+      this.stderr = stderr;
+    }
+
+    /** The last non-empty line of standard error, for a one-line report. */
+    public String lastErrorLine() {
+      String[] lines = stderr.strip().split("\n");
+      return lines.length == 0 ? "" : lines[lines.length - 1].strip();
+    }
+  }
+
+  private ChildProcess() {}
+
+  /**
+   * Runs {@code command} with {@code input} on its standard input (UTF-8) and the extra
+   * environment variables; throws IOException when it cannot be started (not installed).
+   */
+  public static Result run(List<String> command, String input, Map<String, String> environment,
+      long timeoutSeconds) throws IOException, HostException {
+    ProcessBuilder builder = new ProcessBuilder(command);
+    builder.environment().putAll(environment);
+    Process process = builder.start();
+    ByteArrayOutputStream out = new ByteArrayOutputStream();
+    ByteArrayOutputStream err = new ByteArrayOutputStream();
+    // Both pipes drain on their own threads: a child blocked on a full pipe would never exit.
+    Thread outReader = drain(process.getInputStream(), out);
+    Thread errReader = drain(process.getErrorStream(), err);
+    try (OutputStream stdin = process.getOutputStream()) {
+      stdin.write(input.getBytes(StandardCharsets.UTF_8));
+    } catch (IOException e) {
+      // The child closed its input early; its exit status and error output tell why.
+    }
+    try {
+      if (!process.waitFor(timeoutSeconds, TimeUnit.SECONDS)) {
+        process.destroyForcibly();
+        process.waitFor();
+        throw new HostException(ExitStatus.CHILD_FAILED,
+            command.get(0) + " did not finish within " + timeoutSeconds + " s");
+      }
+      outReader.join();
+      errReader.join();
+    } catch (InterruptedException e) {
+      process.destroyForcibly();
+      Thread.currentThread().interrupt();
+      throw new HostException(ExitStatus.INTERNAL, "interrupted while " + command.get(0) + " ran");
+    }
+    return new Result(process.exitValue(), out.toString(StandardCharsets.UTF_8),
+        err.toString(StandardCharsets.UTF_8));
+  }
+
+  private static Thread drain(InputStream stream, ByteArrayOutputStream sink) {
+    Thread reader = new Thread(() -> {
+      try (InputStream in = stream) {
+        in.transferTo(sink);
+      } catch (IOException e) {
+        // The process is gone; what was read so far is all there is.
+      }
+    });
+    reader.setDaemon(true);
+    reader.start();
+    return reader;
+  }
+}

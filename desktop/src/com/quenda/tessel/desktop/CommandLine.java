@@ -1,0 +1,111 @@
+package com.quenda.tessel.desktop;
+
+import java.nio.file.Path;
+import java.util.ArrayList;
+import java.util.List;
+
+/** The parsed command line: a mode, its inputs and the options common to every mode. */
+public final class CommandLine {
+  public static final String USAGE = String.join("\n",
+      "usage: translate.sh photo IMAGE... --from LANG --to LANG --out DIR [options]", "",
+      "Finds the text in each image, translates it and draws the translation in place.",
+      "Writes DIR/NAME.png (translated), DIR/NAME.compare.png (before | after), DIR/NAME.json.", "",
+      "  --from LANG          language of the text in the images (ISO 639-1, default en)",
+      "  --to LANG            language to translate into (ISO 639-1, default es)",
+      "  --out DIR            output directory (default out), created when missing",
+      "  --translations FILE  tab-separated phrase table (source<TAB>translation), asked",
+      "                       before the machine translation; alone for pairs it lacks",
+      "  --quiet              no progress bar and no messages, only errors and the summary", "",
+      "Languages: " + Language.knownCodes());
+
+  public final String mode;
+  public final List<Path> inputs;
+  public final Language from;
+  public final Language to;
+  public final Path out;
+  public final Path translations;
+  public final boolean quiet;
+
+  private CommandLine(String mode, List<Path> inputs, Language from, Language to, Path out,
+      Path translations, boolean quiet) {
+    this.mode = mode;
+    this.inputs = inputs;
+    this.from = from;
+    this.to = to;
+    this.out = out;
+    this.translations = translations;
+    this.quiet = quiet;
+  }
+
+  /** Parses {@code args}; every mistake is a USAGE error naming what is wrong. */
+  public static CommandLine parse(String[] args) throws HostException {
+    if (args.length == 0) {
+      throw usage("no mode given");
+    }
+    String mode = args[0];
+    if (!mode.equals("photo")) {
+      throw usage("unknown mode '" + mode + "' (expected photo)");
+    }
+    List<Path> inputs = new ArrayList<>();
+    String from = "en";
+    String to = "es";
+    String out = "out";
+    String translations = null;
+    boolean quiet = false;
+    for (int i = 1; i < args.length; i++) {
+      String arg = args[i];
+      switch (arg) {
+        case "--from":
+          from = value(args, ++i, arg);
+          break;
+        case "--to":
+          to = value(args, ++i, arg);
+          break;
+        case "--out":
+          out = value(args, ++i, arg);
+          break;
+        case "--translations":
+          translations = value(args, ++i, arg);
+          break;
+        case "--quiet":
+          quiet = true;
+          break;
+        default:
+          if (arg.startsWith("--")) {
+            throw usage("unknown option " + arg);
+          }
+          inputs.add(Path.of(arg));
+      }
+    }
+    if (inputs.isEmpty()) {
+      throw usage("no input image given");
+    }
+    Language source = language(from, "--from");
+    Language target = language(to, "--to");
+    if (source == target) {
+      throw usage("--from and --to are both " + source.iso);
+    }
+    return new CommandLine(mode, List.copyOf(inputs), source, target, Path.of(out),
+        translations == null ? null : Path.of(translations), quiet);
+  }
+
+  private static String value(String[] args, int i, String option) throws HostException {
+    if (i >= args.length || args[i].startsWith("--")) {
+      throw usage(option + " needs a value");
+    }
+    return args[i];
+  }
+
+  private static Language language(String code, String option) throws HostException {
+    Language language = Language.of(code);
+    if (language == null) {
+      throw usage(
+          option + ": unknown language code '" + code + "' (known: " + Language.knownCodes() + ")");
+    }
+    return language;
+  }
+
+  private static HostException usage(String problem) {
+    return new HostException(ExitStatus.USAGE, problem + " (translate.sh --help for usage)");
+  }
+}

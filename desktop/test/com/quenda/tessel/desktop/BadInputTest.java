@@ -1,0 +1,130 @@
+package com.quenda.tessel.desktop;
+
+import static org.junit.jupiter.api.Assertions.assertEquals;
+import static org.junit.jupiter.api.Assertions.assertTrue;
+
+import java.io.ByteArrayOutputStream;
+import java.io.IOException;
+import java.io.PrintStream;
+import java.nio.charset.StandardCharsets;
+import java.nio.file.Files;
+import java.nio.file.Path;
+import java.util.ArrayList;
+import java.util.List;
+import java.util.stream.Stream;
+import org.junit.jupiter.api.BeforeAll;
+import org.junit.jupiter.api.Test;
+import org.junit.jupiter.api.io.TempDir;
+import org.opencv.core.Core;
+import org.opencv.core.CvType;
+import org.opencv.core.Mat;
+import org.opencv.core.Scalar;
+import org.opencv.imgcodecs.Imgcodecs;
+
+/**
+ * Every bad input ends in one line on standard error naming the problem (and the Debian package
+ * that mends it), its own exit status, and no file in the output directory.
+ */
+class BadInputTest {
+  @TempDir static Path dir;
+  static Path good;
+
+  @BeforeAll
+  static void writeInputs() throws IOException {
+    System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
+    good = dir.resolve("plain.png");
+    Mat grey = new Mat(40, 60, CvType.CV_8UC3, new Scalar(128, 128, 128));
+    Imgcodecs.imwrite(good.toString(), grey);
+    grey.release();
+    Files.writeString(dir.resolve("notes.png"), "these are not pixels\n");
+    Files.createFile(dir.resolve("empty.png"));
+    Files.writeString(dir.resolve("bad.tsv"), "no tab on this line\n");
+  }
+
+  static final class Run {
+    final ExitStatus status;
+    final String err;
+    final Path out;
+
+    Run(ExitStatus status, String err, Path out) {
+      this.status = status;
+      this.err = err;
+      this.out = out;
+    }
+  }
+
+  static Run run(String... args) throws IOException {
+    Path out = Files.createTempDirectory(dir, "out");
+    List<String> full = new ArrayList<>(List.of(args));
+    full.addAll(List.of("--out", out.toString()));
+    ByteArrayOutputStream err = new ByteArrayOutputStream();
+    ExitStatus status = TranslateMain.run(full.toArray(new String[0]),
+        new PrintStream(new ByteArrayOutputStream(), true, StandardCharsets.UTF_8),
+        new PrintStream(err, true, StandardCharsets.UTF_8));
+    return new Run(status, err.toString(StandardCharsets.UTF_8), out);
+  }
+
+  static void assertFails(Run run, ExitStatus status, String message) throws IOException {
+    assertEquals(status, run.status, run.err);
+    assertEquals("translate: " + message + "\n", run.err);
+    try (Stream<Path> files = Files.list(run.out)) {
+      assertEquals(List.of(), files.toList(), "nothing is written");
+    }
+  }
+
+  @Test
+  void unreadableInputsStopTheRunBeforeAnythingIsWritten() throws IOException {
+    Path missing = dir.resolve("missing.png");
+    assertFails(run("photo", good.toString(), missing.toString()), ExitStatus.NO_INPUT,
+        missing + ": no such file");
+    assertFails(run("photo", dir.toString()), ExitStatus.NO_INPUT, dir + ": cannot be read");
+    Path notes = dir.resolve("notes.png");
+    assertFails(run("photo", good.toString(), notes.toString()), ExitStatus.NOT_AN_IMAGE,
+        notes + ": not an image OpenCV can read");
+    Path empty = dir.resolve("empty.png");
+    assertFails(
+        run("photo", empty.toString()), ExitStatus.EMPTY_IMAGE, empty + ": the file is empty");
+  }
+
+  @Test
+  void missingLanguagesNameTheDebianPackage() throws IOException {
+    assertFails(run("photo", good.toString(), "--from", "it", "--to", "es"),
+        ExitStatus.MISSING_OCR_DATA,
+        "no OCR data for language 'ita': install the Debian package tesseract-ocr-ita");
+    assertFails(run("photo", good.toString(), "--from", "es", "--to", "pt"),
+        ExitStatus.MISSING_TRANSLATION,
+        "no installed translation from Spanish (es) to Portuguese (pt): "
+            + "install the Debian package apertium-es-pt");
+    assertFails(run("photo", good.toString(), "--from", "en", "--to", "ja"),
+        ExitStatus.MISSING_TRANSLATION,
+        "Debian has no Apertium translation from English (en) to Japanese (ja): "
+            + "give the translations as a phrase table with --translations FILE");
+  }
+
+  @Test
+  void commandLineMistakesAreUsageErrors() throws IOException {
+    String hint = " (translate.sh --help for usage)";
+    assertFails(run("film", good.toString()), ExitStatus.USAGE,
+        "unknown mode 'film' (expected photo)" + hint);
+    assertFails(run("photo"), ExitStatus.USAGE, "no input image given" + hint);
+    assertFails(run("photo", good.toString(), "--to", "xx"), ExitStatus.USAGE,
+        "--to: unknown language code 'xx' (known: " + Language.knownCodes() + ")" + hint);
+    assertFails(run("photo", good.toString(), "--colour"), ExitStatus.USAGE,
+        "unknown option --colour" + hint);
+    Path table = dir.resolve("bad.tsv");
+    assertFails(run("photo", good.toString(), "--translations", table.toString()), ExitStatus.USAGE,
+        table + ":1: expected 'source<TAB>translation'");
+  }
+
+  @Test
+  void anOutputDirectoryThatCannotBeMadeIsReported() throws IOException {
+    ByteArrayOutputStream err = new ByteArrayOutputStream();
+    Path blocked = dir.resolve("notes.png").resolve("out");
+    ExitStatus status =
+        TranslateMain.run(new String[] {"photo", good.toString(), "--out", blocked.toString()},
+            new PrintStream(new ByteArrayOutputStream(), true, StandardCharsets.UTF_8),
+            new PrintStream(err, true, StandardCharsets.UTF_8));
+    assertEquals(ExitStatus.CANNOT_WRITE, status);
+    assertTrue(err.toString(StandardCharsets.UTF_8).contains("cannot write " + blocked));
+  }
+}
