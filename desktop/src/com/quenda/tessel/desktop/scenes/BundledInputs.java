@@ -1,0 +1,52 @@
+package com.quenda.tessel.desktop.scenes;
+
+import java.io.File;
+import java.io.IOException;
+import java.util.List;
+import org.opencv.core.Core;
+import org.opencv.core.Mat;
+import org.opencv.imgcodecs.Imgcodecs;
+import org.opencv.imgproc.Imgproc;
+
+/**
+ * Writes the main job's inputs as PNG files: the bundled photo-like scenes, and the notice with
+ * the engine demo's ten English lines, which the demo's phrase tables translate into Japanese,
+ * Chinese and German. Generated, so the repository keeps no pictures.
+ */
+public final class BundledInputs {
+  /** The ten lines of the phrase tables under desktop/phrases. */
+  public static final List<String> NOTICE_TEXT = List.of("Opening hours: Monday to Friday 9-18",
+      "Please keep this door closed at all times", "Emergency exit",
+      "Platform 3 - trains to the city centre", "No smoking anywhere in the building",
+      "Tickets are sold at the counter", "Fresh coffee and cake served daily until six",
+      "Lost property is on the second floor", "Wet floor - please walk carefully",
+      "Press the button for assistance");
+
+  private BundledInputs() {}
+
+  public static void main(String[] args) throws IOException {
+    File directory = new File(args.length > 0 ? args[0] : "out/inputs");
+    if (!directory.isDirectory() && !directory.mkdirs()) {
+      throw new IOException("cannot create " + directory);
+    }
+    System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
+    for (String name : Scenes.names()) {
+      write(Scenes.bundled(name), directory);
+    }
+    write(new PageScene(Scenes.WIDTH, Scenes.HEIGHT, 7).lines(NOTICE_TEXT).rotation(-2).render(
+              "notice"),
+        directory);
+  }
+
+  private static void write(Scene scene, File directory) throws IOException {
+    File file = new File(directory, scene.name + ".png");
+    Mat bgr = new Mat();
+    Imgproc.cvtColor(scene.rgb, bgr, Imgproc.COLOR_RGB2BGR);
+    boolean written = Imgcodecs.imwrite(file.getPath(), bgr);
+    bgr.release();
+    scene.release();
+    if (!written) {
+      throw new IOException("cannot write " + file);
+    }
+  }
+}
