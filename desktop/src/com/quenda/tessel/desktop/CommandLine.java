@@ -15,6 +15,7 @@ public final class CommandLine {
       "  --out DIR            output directory (default out), created when missing",
       "  --translations FILE  tab-separated phrase table (source<TAB>translation), asked",
       "                       before the machine translation; alone for pairs it lacks",
+      "  --live               video: frames at the source's rate, OCR off the frame path",
       "  --quiet              no progress bar and no messages, only errors and the summary", "",
       "Languages: " + Language.knownCodes());
 
@@ -25,9 +26,10 @@ public final class CommandLine {
   public final Path out;
   public final Path translations;
   public final boolean quiet;
+  public final boolean live;
 
   private CommandLine(String mode, List<Path> inputs, Language from, Language to, Path out,
-      Path translations, boolean quiet) {
+      Path translations, boolean quiet, boolean live) {
     this.mode = mode;
     this.inputs = inputs;
     this.from = from;
@@ -35,6 +37,7 @@ public final class CommandLine {
     this.out = out;
     this.translations = translations;
     this.quiet = quiet;
+    this.live = live;
   }
 
   /** Parses {@code args}; every mistake is a USAGE error naming what is wrong. */
@@ -43,8 +46,8 @@ public final class CommandLine {
       throw usage("no mode given");
     }
     String mode = args[0];
-    if (!mode.equals("photo")) {
-      throw usage("unknown mode '" + mode + "' (expected photo)");
+    if (!mode.equals("photo") && !mode.equals("video")) {
+      throw usage("unknown mode '" + mode + "' (expected photo or video)");
     }
     List<Path> inputs = new ArrayList<>();
     String from = "en";
@@ -52,6 +55,7 @@ public final class CommandLine {
     String out = "out";
     String translations = null;
     boolean quiet = false;
+    boolean live = false;
     for (int i = 1; i < args.length; i++) {
       String arg = args[i];
       switch (arg) {
@@ -70,6 +74,9 @@ public final class CommandLine {
         case "--quiet":
           quiet = true;
           break;
+        case "--live":
+          live = true;
+          break;
         default:
           if (arg.startsWith("--")) {
             throw usage("unknown option " + arg);
@@ -77,8 +84,15 @@ public final class CommandLine {
           inputs.add(Path.of(arg));
       }
     }
+    boolean video = mode.equals("video");
     if (inputs.isEmpty()) {
-      throw usage("no input image given");
+      throw usage(video ? "no video or frame folder given" : "no input image given");
+    }
+    if (video && inputs.size() > 1) {
+      throw usage("video takes one video or frame folder, not " + inputs.size());
+    }
+    if (live && !video) {
+      throw usage("--live is for video");
     }
     Language source = language(from, "--from");
     Language target = language(to, "--to");
@@ -86,7 +100,7 @@ public final class CommandLine {
       throw usage("--from and --to are both " + source.iso);
     }
     return new CommandLine(mode, List.copyOf(inputs), source, target, Path.of(out),
-        translations == null ? null : Path.of(translations), quiet);
+        translations == null ? null : Path.of(translations), quiet, live);
   }
 
   private static String value(String[] args, int i, String option) throws HostException {

@@ -56,6 +56,30 @@ public final class OutputFiles implements AutoCloseable {
     }
   }
 
+  /**
+   * Stages a file that the caller writes itself (a video); returns the temporary path to write,
+   * which keeps {@code name}'s extension.
+   */
+  public Path stage(String name) {
+    return temporary(name);
+  }
+
+  /** Gives up a staged file: deletes what was written under its temporary name. */
+  public void drop(String name) {
+    Path target = directory.resolve(name);
+    staged.removeIf(file -> {
+      if (!file[1].equals(target)) {
+        return false;
+      }
+      try {
+        Files.deleteIfExists(file[0]);
+      } catch (IOException e) {
+        // Left under its temporary name; the real name is never written.
+      }
+      return true;
+    });
+  }
+
   /** Renames every staged file to its real name. */
   public void commit() throws HostException {
     for (Path[] file : staged) {

@@ -1,6 +1,10 @@
 package com.quenda.tessel.desktop;
 
 import com.quenda.tessel.desktop.photo.PhotoCommand;
+import com.quenda.tessel.desktop.video.VideoCommand;
+import java.io.FileNotFoundException;
+import java.io.FileOutputStream;
+import java.io.OutputStream;
 import java.io.PrintStream;
 import java.nio.charset.StandardCharsets;
 import org.opencv.core.Core;
@@ -13,9 +17,26 @@ public final class TranslateMain {
   private TranslateMain() {}
 
   public static void main(String[] args) {
-    PrintStream out = new PrintStream(System.out, true, StandardCharsets.UTF_8);
+    PrintStream out = new PrintStream(reportStream(), true, StandardCharsets.UTF_8);
     PrintStream err = new PrintStream(System.err, true, StandardCharsets.UTF_8);
     System.exit(run(args, out, err).code);
+  }
+
+  /**
+   * Where the report goes: the descriptor the launcher names in TRANSLATE_REPORT_FD (the engine's
+   * tracker prints diagnostics on standard output, which the launcher sends to a file), else
+   * standard output.
+   */
+  private static OutputStream reportStream() {
+    String fd = System.getenv("TRANSLATE_REPORT_FD");
+    if (fd != null && fd.matches("\\d+")) {
+      try {
+        return new FileOutputStream("/dev/fd/" + fd);
+      } catch (FileNotFoundException e) {
+        // Not open after all: standard output it is.
+      }
+    }
+    return System.out;
   }
 
   /** Runs one command; the exit status is returned, not taken, so that tests can call it. */
@@ -27,7 +48,11 @@ public final class TranslateMain {
     try {
       CommandLine command = CommandLine.parse(args);
       System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
-      PhotoCommand.run(command, out, err);
+      if (command.mode.equals("video")) {
+        VideoCommand.run(command, out, err);
+      } else {
+        PhotoCommand.run(command, out, err);
+      }
       return ExitStatus.OK;
     } catch (HostException e) {
       err.println("translate: " + e.getMessage());

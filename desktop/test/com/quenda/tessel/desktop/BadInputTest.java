@@ -105,7 +105,7 @@ class BadInputTest {
   void commandLineMistakesAreUsageErrors() throws IOException {
     String hint = " (translate.sh --help for usage)";
     assertFails(run("film", good.toString()), ExitStatus.USAGE,
-        "unknown mode 'film' (expected photo)" + hint);
+        "unknown mode 'film' (expected photo or video)" + hint);
     assertFails(run("photo"), ExitStatus.USAGE, "no input image given" + hint);
     assertFails(run("photo", good.toString(), "--to", "xx"), ExitStatus.USAGE,
         "--to: unknown language code 'xx' (known: " + Language.knownCodes() + ")" + hint);

@@ -54,8 +54,8 @@ public final class OverlayDrawer implements AutoCloseable {
     Imgproc.cvtColor(rgb, rgba, Imgproc.COLOR_RGB2RGBA);
     int n = overlays.texts.length;
     VexelJNI.renderOneFrame(rgba.getNativeObjAddr(), overlays.texts, overlays.patchRects,
-        overlays.textRects, overlays.ids, overlays.patchAddresses, null, new double[3 * n],
-        overlays.colors);
+        overlays.textRects, overlays.ids, overlays.patchAddresses, overlays.colorScales,
+        new double[3 * n], overlays.colors);
     rgba.release();
     return readBack();
   }

@@ -12,7 +12,7 @@ public final class LineResult {
   /** The engine's text colour, 0xFF000000 | B << 16 | G << 8 | R; 0 when not erased. */
   public final int color;
 
-  LineResult(RecognizedLine line, String translation, int color) {
+  public LineResult(RecognizedLine line, String translation, int color) {
     this.line = line;
     this.translation = translation;
     this.color = color;
@@ -23,7 +23,7 @@ public final class LineResult {
   }
 
   /** The line as the JSON report lists it. */
-  Map<String, Object> json() {
+  public Map<String, Object> json() {
     Map<String, Object> json = new LinkedHashMap<>();
     json.put("text", line.text);
     json.put("translation", translation);

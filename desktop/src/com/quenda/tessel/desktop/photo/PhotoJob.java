@@ -88,8 +88,8 @@ public final class PhotoJob {
       }
     }
     List<RotatedRect> rects = rects(shown);
-    Overlays overlays = new Overlays(
-        texts, patches.patchRects, Rects.pack(rects), ids, patches.addresses(), patches.colors);
+    Overlays overlays = new Overlays(texts, patches.patchRects, Rects.pack(rects), ids,
+        patches.addresses(), patches.colors, null);
     try (OverlayDrawer drawer = new OverlayDrawer(rgb.cols(), rgb.rows())) {
       drawer.setLanguage(target, FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects)));
       return drawer.draw(rgb, overlays);

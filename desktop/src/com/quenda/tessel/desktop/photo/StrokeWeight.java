@@ -17,11 +17,11 @@ import org.opencv.imgproc.Imgproc;
  * Otsu's threshold, which keeps most of the antialiased edge). The line's height varies by a
  * quarter with its words (descenders or none), less than bold and regular strokes differ.
  */
-final class StrokeWeight {
+public final class StrokeWeight {
   private StrokeWeight() {}
 
   /** Median stroke ratio of the lines at {@code rects} in {@code rgb}; 0 without lines. */
-  static double medianRatio(Mat rgb, List<RotatedRect> rects) {
+  public static double medianRatio(Mat rgb, List<RotatedRect> rects) {
     List<Double> ratios = new ArrayList<>();
     for (RotatedRect rect : rects) {
       double ratio = ratio(rgb, rect);

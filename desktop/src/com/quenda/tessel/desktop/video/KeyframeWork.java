@@ -1,0 +1,117 @@
+package com.quenda.tessel.desktop.video;
+
+import com.quenda.tessel.desktop.ExitStatus;
+import com.quenda.tessel.desktop.HostException;
+import com.quenda.tessel.desktop.engine.Eraser;
+import com.quenda.tessel.desktop.engine.FrameMeans;
+import com.quenda.tessel.desktop.ocr.PhotoReader;
+import com.quenda.tessel.desktop.ocr.RecognizedLine;
+import com.quenda.tessel.desktop.translate.Translator;
+import java.util.ArrayList;
+import java.util.HashMap;
+import java.util.List;
+import java.util.Locale;
+import java.util.Map;
+import org.opencv.core.Mat;
+import org.opencv.core.RotatedRect;
+
+/**
+ * The slow half of the host loop, for one keyframe: read the text, translate what is new, erase
+ * the translated lines. On a phone (and with --live) this runs off the frame path, on a worker
+ * thread, while frames keep coming; it touches no renderer state.
+ */
+final class KeyframeWork {
+  /** What one keyframe gave: the lines, their translations (null: failed), patches for those. */
+  static final class Result {
+    final int frame;
+    final List<RecognizedLine> lines;
+    final List<String> translations;
+    /** One patch per translated line, in order. */
+    final Eraser.Patches patches;
+    final double[] means;
+    final double ocrMillis;
+    final double translateMillis;
+    final double eraseMillis;
+
+    Result(int frame, List<RecognizedLine> lines, List<String> translations, Eraser.Patches patches,
+        double[] means, double ocrMillis, double translateMillis, double eraseMillis) {
+      this.frame = frame;
+      this.lines = lines;
+      this.translations = translations;
+      this.patches = patches;
+      this.means = means;
+      this.ocrMillis = ocrMillis;
+      this.translateMillis = translateMillis;
+      this.eraseMillis = eraseMillis;
+    }
+  }
+
+  private final PhotoReader reader;
+  private final Translator translator;
+  private final long extraOcrMillis;
+  // Lines read again at the next keyframe are mostly the same: translate each text once.
+  private final Map<String, String> translated = new HashMap<>();
+
+  /** {@code extraOcrMillis}: a delay added to every OCR run, to test a slow OCR. */
+  KeyframeWork(PhotoReader reader, Translator translator, long extraOcrMillis) {
+    this.reader = reader;
+    this.translator = translator;
+    this.extraOcrMillis = extraOcrMillis;
+  }
+
+  synchronized Result run(Mat rgb, int frame) throws HostException {
+    long start = System.nanoTime();
+    List<RecognizedLine> lines = reader.read(rgb);
+    pause(extraOcrMillis);
+    long read = System.nanoTime();
+
+    List<String> translations = translate(lines);
+    long translatedAt = System.nanoTime();
+
+    List<RotatedRect> rects = new ArrayList<>();
+    for (int i = 0; i < lines.size(); i++) {
+      if (translations.get(i) != null) {
+        rects.add(lines.get(i).rect);
+      }
+    }
+    Eraser.Patches patches = Eraser.erase(rgb, rects);
+    double[] means = FrameMeans.under(rgb, patches.patchRects);
+    long end = System.nanoTime();
+    return new Result(frame, lines, translations, patches, means, (read - start) / 1e6,
+        (translatedAt - read) / 1e6, (end - translatedAt) / 1e6);
+  }
+
+  private List<String> translate(List<RecognizedLine> lines) throws HostException {
+    List<String> missing = new ArrayList<>();
+    for (RecognizedLine line : lines) {
+      if (!translated.containsKey(key(line.text)) && !missing.contains(line.text)) {
+        missing.add(line.text);
+      }
+    }
+    List<String> answers = translator.translate(missing);
+    for (int i = 0; i < missing.size(); i++) {
+      translated.put(key(missing.get(i)), answers.get(i));
+    }
+    List<String> translations = new ArrayList<>();
+    for (RecognizedLine line : lines) {
+      translations.add(translated.get(key(line.text)));
+    }
+    return translations;
+  }
+
+  static String key(String text) {
+    return text.strip().toLowerCase(Locale.ROOT);
+  }
+
+  private static void pause(long millis) throws HostException {
+    if (millis <= 0) {
+      return;
+    }
+    try {
+      Thread.sleep(millis);
+    } catch (InterruptedException e) {
+      Thread.currentThread().interrupt();
+      throw new HostException(ExitStatus.INTERNAL, "interrupted while reading the text");
+    }
+  }
+}

@@ -1,0 +1,529 @@
+package com.quenda.tessel.desktop.video;
+
+import com.quenda.tessel.desktop.ExitStatus;
+import com.quenda.tessel.desktop.HostException;
+import com.quenda.tessel.desktop.Language;
+import com.quenda.tessel.desktop.Progress;
+import com.quenda.tessel.desktop.engine.Eraser;
+import com.quenda.tessel.desktop.engine.FontChoice;
+import com.quenda.tessel.desktop.engine.FrameMeans;
+import com.quenda.tessel.desktop.engine.OverlayDrawer;
+import com.quenda.tessel.desktop.engine.Overlays;
+import com.quenda.tessel.desktop.engine.Rects;
+import com.quenda.tessel.desktop.ocr.PhotoReader;
+import com.quenda.tessel.desktop.ocr.RecognizedLine;
+import com.quenda.tessel.desktop.photo.LineResult;
+import com.quenda.tessel.desktop.photo.StrokeWeight;
+import com.quenda.tessel.desktop.translate.Translator;
+import com.quenda.tessel.tracking.TrackingJNI;
+import java.util.ArrayList;
+import java.util.Arrays;
+import java.util.LinkedHashMap;
+import java.util.List;
+import java.util.Map;
+import java.util.concurrent.ExecutionException;
+import java.util.concurrent.ExecutorService;
+import java.util.concurrent.Executors;
+import java.util.concurrent.Future;
+import org.opencv.core.Mat;
+import org.opencv.core.RotatedRect;
+import org.opencv.imgproc.Imgproc;
+
+/**
+ * Translates a video in place, frame by frame, the way a phone host drives the engine:
+ *
+ * <ol>
+ *   <li>track: the tracker moves the lines' rectangles into the new frame;
+ *   <li>keyframe: when the rules call for it, read, translate and erase the text of a frame
+ *       ({@link KeyframeWork}) and start a new tracker on it; lines found again keep their ids;
+ *   <li>erase again the lines whose patches no longer match the view;
+ *   <li>draw: the frame with each visible line's patch and translation at its tracked place;
+ *   <li>encode.
+ * </ol>
+ *
+ * <p>Offline, a keyframe's work runs in line and holds its frame up. Live, frames arrive at the
+ * source's rate and are never held up: the keyframe's work runs on a worker thread, the frames
+ * that arrive meanwhile are kept, and when the result for frame k arrives at frame k+m a tracker
+ * started on frame k with the result's rectangles is run through frames k+1..k+m, which brings
+ * the rectangles to frame k+m before they are drawn. Until the first result, frames pass through.
+ */
+public final class VideoJob {
+  // Frames kept for catching up while a live keyframe is worked on: 8 s at 30 fps. A result later
+  // than that is dropped and a new keyframe taken.
+  private static final int MAX_CATCH_UP_FRAMES = 240;
+
+  private final KeyframeWork work;
+  private final Language target;
+  private final boolean live;
+
+  /** {@code extraOcrMillis} delays every OCR run: a test hook for a slow OCR. */
+  public VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
+      long extraOcrMillis) {
+    this.work = new KeyframeWork(reader, translator, extraOcrMillis);
+    this.target = target;
+    this.live = live;
+  }
+
+  /** Runs the whole source through; {@code sink} receives every output frame. */
+  public VideoResult run(FrameSource source, VideoSink sink, Progress progress)
+      throws HostException {
+    Loop loop = new Loop(source, sink, progress);
+    try {
+      return loop.run();
+    } finally {
+      loop.release();
+    }
+  }
+
+  /** The state of one run. */
+  private final class Loop {
+    private final FrameSource source;
+    private final VideoSink sink;
+    private final Progress progress;
+    private final Timings timings = new Timings();
+    private final List<FrameRecord> records = new ArrayList<>();
+    private final List<Map<String, Object>> keyframes = new ArrayList<>();
+    private final List<Double> latencies = new ArrayList<>();
+    private final ExecutorService worker;
+
+    private OverlayDrawer drawer;
+    private long tracker;
+    private Mat keyframeRgba;
+    private List<ShownLine> shown = new ArrayList<>();
+    private long nextId;
+    private int lastKeyframe = Integer.MIN_VALUE;
+    private boolean fontChosen;
+
+    // Live: the keyframe being worked on, the reason it was taken, and the frames since.
+    private Future<KeyframeWork.Result> pending;
+    private String pendingReason;
+    private final List<Mat> catchUp = new ArrayList<>();
+    private long startNanos;
+
+    Loop(FrameSource source, VideoSink sink, Progress progress) {
+      this.source = source;
+      this.sink = sink;
+      this.progress = progress;
+      this.worker = live ? Executors.newSingleThreadExecutor(runnable -> {
+        Thread thread = new Thread(runnable, "keyframe-worker");
+        thread.setDaemon(true);
+        return thread;
+      })
+                         : null;
+    }
+
+    VideoResult run() throws HostException {
+      startNanos = System.nanoTime();
+      int k = 0;
+      for (Mat frame = nextFrame(k); frame != null; frame = nextFrame(++k)) {
+        try {
+          process(frame, k);
+        } finally {
+          frame.release();
+        }
+        progress.step(String.format("%s: frame %d", source.name(), k + 1));
+      }
+      double seconds = (System.nanoTime() - startNanos) / 1e9;
+      return new VideoResult(k, k / seconds, keyframes, records, timings, latencies);
+    }
+
+    private Mat nextFrame(int k) throws HostException {
+      if (live) {
+        waitForArrival(k);
+      }
+      return source.next();
+    }
+
+    private void process(Mat frame, int k) throws HostException {
+      long start = System.nanoTime();
+      boolean lostAll = track(frame);
+      if (live) {
+        installFinishedWork(frame, k);
+      }
+      String reason = keyframeReason(frame, k, lostAll);
+      if (reason != null) {
+        takeKeyframe(frame, k, reason);
+      } else if (pending != null) {
+        catchUp.add(frame.clone());
+      }
+      if (!live) {
+        eraseAgainWhereNeeded(frame);
+      }
+      Mat drawn = draw(frame, k);
+      timings.add("frame", (System.nanoTime() - start) / 1e6);
+      long encodeStart = System.nanoTime();
+      sink.add(drawn);
+      if (drawn != frame) {
+        drawn.release();
+      }
+      timings.add("encode", (System.nanoTime() - encodeStart) / 1e6);
+    }
+
+    /** Step 1: moves the shown lines into this frame; true when the tracker lost all of them. */
+    private boolean track(Mat frame) {
+      if (tracker == 0) {
+        return false;
+      }
+      long start = System.nanoTime();
+      double[] rects = TrackingJNI.updateTracker(tracker, frame.getNativeObjAddr());
+      boolean lostAll = applyTracked(rects);
+      timings.add("track", (System.nanoTime() - start) / 1e6);
+      return lostAll;
+    }
+
+    private boolean applyTracked(double[] rects) {
+      boolean any = false;
+      for (int i = 0; i < shown.size(); i++) {
+        boolean lost = rects == null || 5 * i + 4 >= rects.length || isZero(rects, i);
+        shown.get(i).rect = lost ? null : Rects.at(rects, i);
+        any |= !lost;
+      }
+      return !any;
+    }
+
+    /** Step 2: why this frame must be read again, or null. */
+    private String keyframeReason(Mat frame, int k, boolean lostAll) {
+      if (pending != null) {
+        return null;
+      }
+      if (lastKeyframe == Integer.MIN_VALUE) {
+        return "first frame";
+      }
+      if (shown.isEmpty()) {
+        return k - lastKeyframe >= KeyframeRules.RETRY_FRAMES ? "no text on screen" : null;
+      }
+      if (lostAll) {
+        return "tracking lost";
+      }
+      if (TrackingJNI.getCoverageLeft(tracker) < KeyframeRules.MIN_COVERAGE) {
+        return "text leaving the view";
+      }
+      if (frameAccuracy(frame) < KeyframeRules.MIN_FRAME_ACCURACY) {
+        return "view changed";
+      }
+      if (live && anyNeedsErasing(frame)) {
+        // Live, erasing again goes through the worker as a keyframe: it must not hold a frame.
+        return "patches out of date";
+      }
+      return null;
+    }
+
+    private double frameAccuracy(Mat frame) {
+      Mat rgba = new Mat();
+      Imgproc.cvtColor(frame, rgba, Imgproc.COLOR_RGB2RGBA);
+      double accuracy = TrackingJNI.calculateFrameAccuracy(
+          keyframeRgba.getNativeObjAddr(), rgba.getNativeObjAddr());
+      rgba.release();
+      return accuracy;
+    }
+
+    private void takeKeyframe(Mat frame, int k, String reason) throws HostException {
+      lastKeyframe = k;
+      if (live) {
+        Mat copy = frame.clone();
+        catchUp.add(copy);
+        pendingReason = reason;
+        pending = worker.submit(() -> work.run(copy, k));
+        return;
+      }
+      KeyframeWork.Result result = work.run(frame, k);
+      install(result, reason, frame, null);
+    }
+
+    /** Live: takes a finished keyframe result, catching its rectangles up to this frame. */
+    private void installFinishedWork(Mat frame, int k) throws HostException {
+      if (pending == null) {
+        return;
+      }
+      if (!pending.isDone()) {
+        if (catchUp.size() > MAX_CATCH_UP_FRAMES) {
+          pending.cancel(true);
+          pending = null;
+          releaseCatchUp();
+          lastKeyframe = Integer.MIN_VALUE;
+        }
+        return;
+      }
+      KeyframeWork.Result result = result(pending);
+      pending = null;
+      catchUp.add(frame.clone());
+      install(result, pendingReason, catchUp.get(0), catchUp.subList(1, catchUp.size()));
+      releaseCatchUp();
+      latencies.add((System.nanoTime() - arrivalNanos(result.frame)) / 1e6);
+    }
+
+    /**
+     * Makes a keyframe's lines the shown ones: a new tracker on the keyframe's frame (brought
+     * through {@code laterFrames} when live), ids kept for lines found again.
+     */
+    private void install(KeyframeWork.Result result, String reason, Mat keyframe,
+        List<Mat> laterFrames) throws HostException {
+      timings.add("ocr", result.ocrMillis);
+      timings.add("translate", result.translateMillis);
+      timings.add("erase", result.eraseMillis);
+      keyframes.add(keyframeJson(result, reason));
+
+      List<ShownLine> next = new ArrayList<>();
+      for (int i = 0, p = 0; i < result.lines.size(); i++) {
+        RecognizedLine line = result.lines.get(i);
+        String translation = result.translations.get(i);
+        if (translation == null) {
+          continue;
+        }
+        ShownLine shownLine = new ShownLine(idFor(line), line, translation);
+        shownLine.replacePatch(result.patches.overlays.get(p), result.patches.colors[p], line.rect,
+            Arrays.copyOfRange(result.means, 3 * p, 3 * p + 3));
+        next.add(shownLine);
+        ++p;
+      }
+      releaseShown();
+      shown = next;
+      chooseFont(keyframe);
+      startTracker(keyframe, laterFrames);
+    }
+
+    private void startTracker(Mat keyframe, List<Mat> laterFrames) {
+      if (tracker != 0) {
+        TrackingJNI.releaseTracker(tracker);
+        tracker = 0;
+      }
+      if (keyframeRgba != null) {
+        keyframeRgba.release();
+      }
+      keyframeRgba = new Mat();
+      Imgproc.cvtColor(keyframe, keyframeRgba, Imgproc.COLOR_RGB2RGBA);
+      if (shown.isEmpty()) {
+        return;
+      }
+      List<RotatedRect> rects = new ArrayList<>();
+      for (ShownLine line : shown) {
+        rects.add(line.read.rect);
+      }
+      tracker = TrackingJNI.initializeTracker(keyframe.getNativeObjAddr(), Rects.pack(rects));
+      if (laterFrames != null && !laterFrames.isEmpty()) {
+        long start = System.nanoTime();
+        double[] moved = null;
+        for (Mat later : laterFrames) {
+          moved = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+        }
+        applyTracked(moved);
+        timings.add("catch-up", (System.nanoTime() - start) / 1e6);
+      }
+    }
+
+    /** An old line's id when the same text stands in about the same place. */
+    private long idFor(RecognizedLine line) {
+      String key = KeyframeWork.key(line.text);
+      for (ShownLine old : shown) {
+        RotatedRect at = old.rect != null ? old.rect : old.read.rect;
+        double reach = Math.max(at.size.height, line.rect.size.height);
+        double dx = at.center.x - line.rect.center.x;
+        double dy = at.center.y - line.rect.center.y;
+        if (KeyframeWork.key(old.read.text).equals(key) && dx * dx + dy * dy < reach * reach) {
+          return old.id;
+        }
+      }
+      return nextId++;
+    }
+
+    private void chooseFont(Mat keyframe) throws HostException {
+      if (fontChosen || shown.isEmpty()) {
+        return;
+      }
+      List<RotatedRect> rects = new ArrayList<>();
+      for (ShownLine line : shown) {
+        rects.add(line.read.rect);
+      }
+      drawer(keyframe).setLanguage(
+          target, FontChoice.weightOf(StrokeWeight.medianRatio(keyframe, rects)));
+      fontChosen = true;
+    }
+
+    private boolean anyNeedsErasing(Mat frame) {
+      return !linesNeedingErasing(frame).isEmpty();
+    }
+
+    private List<ShownLine> linesNeedingErasing(Mat frame) {
+      List<ShownLine> visible = visible();
+      double[] means = FrameMeans.under(frame, patchRects(visible));
+      List<ShownLine> stale = new ArrayList<>();
+      for (int i = 0; i < visible.size(); i++) {
+        ShownLine line = visible.get(i);
+        double[] gains =
+            FrameMeans.gains(Arrays.copyOfRange(means, 3 * i, 3 * i + 3), line.referenceMeans);
+        if (KeyframeRules.needsErasing(line.erasedAt, line.rect, gains)) {
+          stale.add(line);
+        }
+      }
+      return stale;
+    }
+
+    /** Step 3 (offline): cuts new patches from this frame where the old ones no longer match. */
+    private void eraseAgainWhereNeeded(Mat frame) throws HostException {
+      List<ShownLine> stale = linesNeedingErasing(frame);
+      if (stale.isEmpty()) {
+        return;
+      }
+      long start = System.nanoTime();
+      List<RotatedRect> rects = new ArrayList<>();
+      for (ShownLine line : stale) {
+        rects.add(line.rect);
+      }
+      Eraser.Patches patches = Eraser.erase(frame, rects);
+      double[] means = FrameMeans.under(frame, patches.patchRects);
+      for (int i = 0; i < stale.size(); i++) {
+        stale.get(i).replacePatch(patches.overlays.get(i), patches.colors[i], rects.get(i),
+            Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
+      }
+      timings.add("erase again", (System.nanoTime() - start) / 1e6);
+    }
+
+    /** Step 4: the frame with every visible line drawn over it; the frame itself when none. */
+    private Mat draw(Mat frame, int k) throws HostException {
+      List<ShownLine> visible = visible();
+      List<FrameRecord.Drawn> drawnLines = new ArrayList<>();
+      for (ShownLine line : visible) {
+        drawnLines.add(new FrameRecord.Drawn(line.id, line.read.text, line.translation, line.rect));
+      }
+      records.add(new FrameRecord(k, drawnLines));
+      if (visible.isEmpty()) {
+        return frame;
+      }
+      long start = System.nanoTime();
+      int n = visible.size();
+      String[] texts = new String[n];
+      long[] ids = new long[n];
+      long[] patches = new long[n];
+      int[] colors = new int[n];
+      List<RotatedRect> rects = new ArrayList<>();
+      for (int i = 0; i < n; i++) {
+        ShownLine line = visible.get(i);
+        texts[i] = line.translation;
+        ids[i] = line.id;
+        patches[i] = line.patch.getNativeObjAddr();
+        colors[i] = line.color;
+        rects.add(line.rect);
+      }
+      double[] patchRects = patchRects(visible);
+      double[] gains = new double[3 * n];
+      double[] means = FrameMeans.under(frame, patchRects);
+      for (int i = 0; i < n; i++) {
+        double[] lineGains = FrameMeans.gains(
+            Arrays.copyOfRange(means, 3 * i, 3 * i + 3), visible.get(i).referenceMeans);
+        System.arraycopy(lineGains, 0, gains, 3 * i, 3);
+      }
+      Mat drawn = drawer(frame).draw(
+          frame, new Overlays(texts, patchRects, Rects.pack(rects), ids, patches, colors, gains));
+      timings.add("draw", (System.nanoTime() - start) / 1e6);
+      return drawn;
+    }
+
+    private List<ShownLine> visible() {
+      List<ShownLine> visible = new ArrayList<>();
+      for (ShownLine line : shown) {
+        if (line.rect != null) {
+          visible.add(line);
+        }
+      }
+      return visible;
+    }
+
+    private double[] patchRects(List<ShownLine> lines) {
+      List<RotatedRect> rects = new ArrayList<>();
+      for (ShownLine line : lines) {
+        rects.add(line.rect);
+      }
+      return Eraser.enlarged(Rects.pack(rects));
+    }
+
+    /** The renderer, started on first use for the source's frame size. */
+    private OverlayDrawer drawer(Mat frame) throws HostException {
+      if (drawer == null) {
+        drawer = new OverlayDrawer(frame.cols(), frame.rows());
+      }
+      return drawer;
+    }
+
+    private Map<String, Object> keyframeJson(KeyframeWork.Result result, String reason) {
+      List<Object> lines = new ArrayList<>();
+      for (int i = 0, p = 0; i < result.lines.size(); i++) {
+        boolean translated = result.translations.get(i) != null;
+        lines.add(new LineResult(result.lines.get(i), result.translations.get(i),
+            translated ? result.patches.colors[p++] : 0)
+                      .json());
+      }
+      Map<String, Object> json = new LinkedHashMap<>();
+      json.put("frame", result.frame);
+      json.put("reason", reason);
+      json.put("lines", lines);
+      return json;
+    }
+
+    private void waitForArrival(int k) throws HostException {
+      long wait = arrivalNanos(k) - System.nanoTime();
+      if (wait <= 0) {
+        return;
+      }
+      try {
+        Thread.sleep(wait / 1_000_000, (int) (wait % 1_000_000));
+      } catch (InterruptedException e) {
+        Thread.currentThread().interrupt();
+        throw new HostException(ExitStatus.INTERNAL, "interrupted");
+      }
+    }
+
+    private long arrivalNanos(int k) {
+      return startNanos + (long) (k * 1e9 / source.fps());
+    }
+
+    private void releaseCatchUp() {
+      catchUp.forEach(Mat::release);
+      catchUp.clear();
+    }
+
+    private void releaseShown() {
+      shown.forEach(ShownLine::release);
+    }
+
+    void release() {
+      if (worker != null) {
+        worker.shutdownNow();
+      }
+      releaseCatchUp();
+      releaseShown();
+      if (tracker != 0) {
+        TrackingJNI.releaseTracker(tracker);
+      }
+      if (keyframeRgba != null) {
+        keyframeRgba.release();
+      }
+      if (drawer != null) {
+        drawer.close();
+      }
+    }
+  }
+
+  private static KeyframeWork.Result result(Future<KeyframeWork.Result> future)
+      throws HostException {
+    try {
+      return future.get();
+    } catch (ExecutionException e) {
+      if (e.getCause() instanceof HostException) {
+        throw(HostException) e.getCause();
+      }
+      throw new HostException(ExitStatus.INTERNAL, "keyframe work failed: " + e.getCause(), e);
+    } catch (InterruptedException e) {
+      Thread.currentThread().interrupt();
+      throw new HostException(ExitStatus.INTERNAL, "interrupted");
+    }
+  }
+
+  private static boolean isZero(double[] rects, int i) {
+    for (int j = 0; j < 5; j++) {
+      if (rects[5 * i + j] != 0) {
+        return false;
+      }
+    }
+    return true;
+  }
+}

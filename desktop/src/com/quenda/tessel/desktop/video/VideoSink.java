@@ -1,0 +1,137 @@
+package com.quenda.tessel.desktop.video;
+
+import com.quenda.tessel.desktop.ExitStatus;
+import com.quenda.tessel.desktop.HostException;
+import com.quenda.tessel.desktop.OutputFiles;
+import java.awt.image.BufferedImage;
+import java.awt.image.DataBufferByte;
+import java.io.IOException;
+import java.nio.file.Path;
+import java.util.List;
+import org.opencv.core.Mat;
+import org.opencv.core.Size;
+import org.opencv.imgproc.Imgproc;
+import org.opencv.videoio.VideoWriter;
+
+/**
+ * The translated video and its preview, staged in the output directory until the last frame is
+ * in. The video is H.264 in MP4 where the installed codecs allow, else MPEG-4 Part 2 in MP4, else
+ * Motion JPEG in AVI. The preview is a small animated GIF of the first seconds, every third frame.
+ */
+final class VideoSink implements AutoCloseable {
+  private record Codec(String fourcc, String extension) {}
+
+  private static final List<Codec> CODECS =
+      List.of(new Codec("avc1", ".mp4"), new Codec("mp4v", ".mp4"), new Codec("MJPG", ".avi"));
+  static final int PREVIEW_WIDTH = 480;
+  static final int PREVIEW_STEP = 3;
+  static final int PREVIEW_FRAMES = 40;
+
+  private final OutputFiles files;
+  private final String name;
+  private final double fps;
+  private VideoWriter writer;
+  private Codec codec;
+  private AnimatedGif preview;
+  private int frames;
+
+  VideoSink(OutputFiles files, String name, double fps) {
+    this.files = files;
+    this.name = name;
+    this.fps = fps;
+  }
+
+  /** Appends an RGB frame. */
+  void add(Mat rgb) throws HostException {
+    if (writer == null) {
+      open(rgb.size());
+    }
+    Mat bgr = new Mat();
+    Imgproc.cvtColor(rgb, bgr, Imgproc.COLOR_RGB2BGR);
+    writer.write(bgr);
+    if (frames % PREVIEW_STEP == 0 && frames / PREVIEW_STEP < PREVIEW_FRAMES) {
+      addPreview(bgr);
+    }
+    bgr.release();
+    ++frames;
+  }
+
+  /** The video's file name, once the first frame is in. */
+  String videoName() {
+    return codec == null ? null : name + codec.extension;
+  }
+
+  String codecName() {
+    return codec == null ? null : codec.fourcc;
+  }
+
+  /** Closes the streams; the caller then commits the output files. */
+  void finish() throws HostException {
+    if (writer != null) {
+      writer.release();
+    }
+    try {
+      if (preview != null) {
+        preview.close();
+        preview = null;
+      }
+    } catch (IOException e) {
+      throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
+    }
+  }
+
+  @Override
+  public void close() {
+    if (writer != null) {
+      writer.release();
+    }
+    if (preview != null) {
+      try {
+        preview.close();
+      } catch (IOException e) {
+        // Staged only; the output files remove it.
+      }
+    }
+  }
+
+  private void open(Size size) throws HostException {
+    for (Codec candidate : CODECS) {
+      Path path = files.stage(name + candidate.extension);
+      String c = candidate.fourcc;
+      VideoWriter w = new VideoWriter(path.toString(),
+          VideoWriter.fourcc(c.charAt(0), c.charAt(1), c.charAt(2), c.charAt(3)), fps, size);
+      if (w.isOpened()) {
+        writer = w;
+        codec = candidate;
+        break;
+      }
+      w.release();
+      files.drop(name + candidate.extension);
+    }
+    if (writer == null) {
+      throw new HostException(ExitStatus.CANNOT_WRITE,
+          "no video codec could write " + name + " (tried H.264, MPEG-4 and Motion JPEG)");
+    }
+    int delay = (int) Math.round(1000.0 * PREVIEW_STEP / fps);
+    try {
+      preview = new AnimatedGif(files.stage(name + ".preview.gif").toFile(), delay);
+    } catch (IOException e) {
+      throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
+    }
+  }
+
+  private void addPreview(Mat bgr) throws HostException {
+    int height = (int) Math.round((double) bgr.rows() * PREVIEW_WIDTH / bgr.cols());
+    Mat small = new Mat();
+    Imgproc.resize(bgr, small, new Size(PREVIEW_WIDTH, height), 0, 0, Imgproc.INTER_AREA);
+    BufferedImage image =
+        new BufferedImage(small.cols(), small.rows(), BufferedImage.TYPE_3BYTE_BGR);
+    small.get(0, 0, ((DataBufferByte) image.getRaster().getDataBuffer()).getData());
+    small.release();
+    try {
+      preview.add(image);
+    } catch (IOException e) {
+      throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
+    }
+  }
+}
