@@ -33,15 +33,15 @@ final class CharacterDetector {
 
   List<Component> detect(Mat grey) {
     List<Component> out = new ArrayList<>();
-    collect(grey, false, out);
+    collect(grey, true, out);
     Mat negative = new Mat();
     Core.bitwise_not(grey, negative);
-    collect(negative, true, out);
+    collect(negative, false, out);
     negative.release();
     return out;
   }
 
-  /** With pass2Only MSER finds the regions darker than their surround. */
+  /** With pass2Only MSER finds the regions lighter than their surround. */
   private void collect(Mat grey, boolean bright, List<Component> out) {
     List<MatOfPoint> regions = new ArrayList<>();
     MatOfRect boxes = new MatOfRect();
@@ -62,8 +62,8 @@ final class CharacterDetector {
 
   /**
    * Height from MIN_HEIGHT to a third of the picture; width at most twice the height (wide enough
-   * for "m" or two touching letters tilted by 30°); ink covering 12 to 90% of the box (strokes,
-   * not full blocks).
+   * for "m" or two touching letters tilted by 30°); ink covering at least 12% of the box, and at
+   * most 80% unless the box is a narrow upright stroke.
    */
   static boolean letterShaped(Rect box, int area, int imageHeight) {
     if (box.height < MIN_HEIGHT || box.height > imageHeight / 3) {
@@ -73,7 +73,10 @@ final class CharacterDetector {
       return false;
     }
     double fill = area / (double) (box.width * box.height);
-    return fill >= 0.12 && fill <= 0.9;
+    if (fill > 0.8 && box.width > 0.4 * box.height) {
+      return false; // a solid block (a brick, a pane), not a stroke like "I" or "l"
+    }
+    return fill >= 0.12;
   }
 
   /** MSER reports a letter again at neighbouring thresholds with nearly the same box. */

@@ -18,6 +18,17 @@ final class Component {
     this.bright = bright;
   }
 
+  private int[] xy;
+
+  /** The pixels as interleaved x, y (copied from native memory once). */
+  int[] xy() {
+    if (xy == null) {
+      xy = new int[area * 2];
+      points.get(0, 0, xy);
+    }
+    return xy;
+  }
+
   double cx() {
     return box.x + box.width / 2.0;
   }

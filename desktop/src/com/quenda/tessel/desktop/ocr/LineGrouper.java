@@ -1,6 +1,7 @@
 package com.quenda.tessel.desktop.ocr;
 
 import java.util.ArrayList;
+import java.util.Arrays;
 import java.util.Comparator;
 import java.util.HashMap;
 import java.util.List;
@@ -24,10 +25,8 @@ import org.opencv.imgproc.Imgproc;
  * above and below, on a page, do not. Second, each linked group's direction is fitted through its
  * centres and the links are redone within 20° of it, which cuts groups that bridged two lines.
  *
- * <p>A line's rectangle is the minimum-area rectangle of its candidates' pixels: it hugs the ink
- * and, for a row of letters, lies along the baseline. For very short rows that rectangle can turn
- * to a diagonal, so when it strays more than 8° from the fitted direction the fitted direction is
- * used and the ink is measured along it.
+ * <p>Rows narrower than 1.3 times their height are dropped (a lone letter or texture blob); the
+ * rectangle is {@link InkRect}'s.
  */
 final class LineGrouper {
   private static final double MAX_LINK_ANGLE = 40;
@@ -98,28 +97,19 @@ final class LineGrouper {
     int gapX = Math.max(a.box.x, b.box.x) - Math.min(a.box.x + a.box.width, b.box.x + b.box.width);
     int gapY =
         Math.max(a.box.y, b.box.y) - Math.min(a.box.y + a.box.height, b.box.y + b.box.height);
-    if (gapX < 0 && gapY < 0) {
-      return true; // overlapping boxes: parts of one letter or touching letters
+    double dx = b.cx() - a.cx();
+    double dy = b.cy() - a.cy();
+    if (Math.hypot(dx, dy) < 0.5 * Math.min(ha, hb)) {
+      return true; // one letter found at two thresholds, or a letter and its stroke
     }
     if (Math.hypot(Math.max(0, gapX), Math.max(0, gapY)) > 0.9 * tall) {
       return false;
     }
-    double angle = Math.toDegrees(Math.atan2(b.cy() - a.cy(), b.cx() - a.cx()));
+    double angle = Math.toDegrees(Math.atan2(dy, dx));
     if (Double.isNaN(direction)) {
-      return Math.abs(foldAngle(angle)) <= MAX_LINK_ANGLE;
+      return Math.abs(InkRect.fold(angle)) <= MAX_LINK_ANGLE;
     }
-    return Math.abs(foldAngle(angle - direction)) <= MAX_REFIT_ANGLE;
-  }
-
-  /** An undirected angle brought into (-90, 90]. */
-  static double foldAngle(double a) {
-    double f = a % 180;
-    if (f <= -90) {
-      f += 180;
-    } else if (f > 90) {
-      f -= 180;
-    }
-    return f;
+    return Math.abs(InkRect.fold(angle - direction)) <= MAX_REFIT_ANGLE;
   }
 
   /** Direction of the row through its candidates' centres, in degrees, robust to outliers. */
@@ -131,75 +121,43 @@ final class LineGrouper {
     MatOfPoint2f m = new MatOfPoint2f(centres);
     Mat fit = new Mat();
     Imgproc.fitLine(m, fit, Imgproc.DIST_HUBER, 0, 0.01, 0.01);
-    double angle = foldAngle(Math.toDegrees(Math.atan2(fit.get(1, 0)[0], fit.get(0, 0)[0])));
+    double angle = InkRect.fold(Math.toDegrees(Math.atan2(fit.get(1, 0)[0], fit.get(0, 0)[0])));
     m.release();
     fit.release();
     return angle;
   }
 
-  private static TextLine line(List<Component> row, double direction, boolean bright) {
-    MatOfPoint2f pts = points(row);
-    RotatedRect r = alongRow(Imgproc.minAreaRect(pts), direction);
-    if (Math.abs(foldAngle(r.angle - direction)) > 8) {
-      r = measureAlong(pts, direction);
+  private static TextLine line(List<Component> all, double direction, boolean bright) {
+    List<Component> row = withoutTallOutliers(all);
+    if (row.size() < 2) {
+      return null;
     }
-    pts.release();
-    if (r.size.width < 1.3 * r.size.height) {
+    RotatedRect r = InkRect.of(row, direction);
+    if (r == null || r.size.width < 1.3 * r.size.height) {
       return null;
     }
     return new TextLine(row, r, bright);
   }
 
-  /** The same rectangle described with its width on the side nearest the row's direction. */
-  static RotatedRect alongRow(RotatedRect r, double direction) {
-    double a = foldAngle(r.angle);
-    double w = r.size.width;
-    double h = r.size.height;
-    if (Math.abs(foldAngle(a - direction)) > 45) {
-      a = foldAngle(a + 90);
-      double t = w;
-      w = h;
-      h = t;
+  /**
+   * Without candidates over 1.45 times the row's median height: a letter that blur has fused with
+   * a descender of the line above would otherwise stretch the rectangle and skew its angle. Tall
+   * letters (capitals and descenders beside x-height letters) stay within that factor.
+   */
+  static List<Component> withoutTallOutliers(List<Component> row) {
+    int[] heights = new int[row.size()];
+    for (int i = 0; i < heights.length; i++) {
+      heights[i] = row.get(i).box.height;
     }
-    return new RotatedRect(r.center, new Size(w, h), a);
-  }
-
-  /** The ink's extent along {@code direction} and across it. */
-  private static RotatedRect measureAlong(MatOfPoint2f pts, double direction) {
-    double t = Math.toRadians(direction);
-    double ux = Math.cos(t);
-    double uy = Math.sin(t);
-    float[] p = new float[(int) pts.total() * 2];
-    pts.get(0, 0, p);
-    double minU = Double.MAX_VALUE;
-    double maxU = -Double.MAX_VALUE;
-    double minV = Double.MAX_VALUE;
-    double maxV = -Double.MAX_VALUE;
-    for (int i = 0; i < p.length; i += 2) {
-      double u = p[i] * ux + p[i + 1] * uy;
-      double v = -p[i] * uy + p[i + 1] * ux;
-      minU = Math.min(minU, u);
-      maxU = Math.max(maxU, u);
-      minV = Math.min(minV, v);
-      maxV = Math.max(maxV, v);
-    }
-    double cu = (minU + maxU) / 2;
-    double cv = (minV + maxV) / 2;
-    return new RotatedRect(new Point(cu * ux - cv * uy, cu * uy + cv * ux),
-        new Size(maxU - minU, maxV - minV), direction);
-  }
-
-  private static MatOfPoint2f points(List<Component> row) {
-    List<Mat> parts = new ArrayList<>();
+    Arrays.sort(heights);
+    double limit = 1.45 * heights[heights.length / 2];
+    List<Component> out = new ArrayList<>();
     for (Component c : row) {
-      parts.add(c.points);
+      if (c.box.height <= limit) {
+        out.add(c);
+      }
     }
-    Mat all = new Mat();
-    Core.vconcat(parts, all);
-    MatOfPoint2f f = new MatOfPoint2f();
-    all.convertTo(f, CvType.CV_32FC2);
-    all.release();
-    return f;
+    return out;
   }
 
   /**

@@ -2,7 +2,9 @@ package com.quenda.tessel.desktop.ocr;
 
 import org.opencv.core.Core;
 import org.opencv.core.Mat;
+import org.opencv.core.Rect;
 import org.opencv.core.RotatedRect;
+import org.opencv.core.Scalar;
 import org.opencv.core.Size;
 import org.opencv.imgproc.Imgproc;
 
@@ -16,6 +18,8 @@ import org.opencv.imgproc.Imgproc;
  */
 final class LineRectifier {
   static final double INK_HEIGHT = 40;
+  /** Clear ground kept around the ink, in ink heights; the rest of the margin is painted over. */
+  static final double CLEAR_GAP = 0.2;
 
   private LineRectifier() {}
 
@@ -36,6 +40,57 @@ final class LineRectifier {
     if (bright) {
       Core.bitwise_not(out, out);
     }
+    clearAround(out,
+        new Rect((int) Math.round((margin - CLEAR_GAP * h) * scale),
+            (int) Math.round((margin - CLEAR_GAP * h) * scale),
+            (int) Math.round((rect.size.width + 2 * CLEAR_GAP * h) * scale),
+            (int) Math.round((h + 2 * CLEAR_GAP * h) * scale)));
     return out;
+  }
+
+  /**
+   * Paints the strip outside {@code keep} with the ground's grey: the margin shows whatever lies
+   * around the line (a plate's border or edge, the next line's descenders), which the recogniser
+   * would otherwise read as "|", ":" or an extra letter. The ground's grey is the median of the
+   * pixels above the Otsu threshold inside the kept part.
+   */
+  private static void clearAround(Mat strip, Rect keep) {
+    int x0 = Math.max(0, keep.x);
+    int y0 = Math.max(0, keep.y);
+    int x1 = Math.min(strip.cols(), keep.x + keep.width);
+    int y1 = Math.min(strip.rows(), keep.y + keep.height);
+    if (x1 <= x0 || y1 <= y0) {
+      return;
+    }
+    Rect inner = new Rect(x0, y0, x1 - x0, y1 - y0);
+    Mat roi = strip.submat(inner);
+    Mat binary = new Mat();
+    Imgproc.threshold(roi, binary, 0, 255, Imgproc.THRESH_BINARY | Imgproc.THRESH_OTSU);
+    byte[] px = new byte[(int) roi.total()];
+    byte[] bin = new byte[px.length];
+    roi.clone().get(0, 0, px);
+    binary.get(0, 0, bin);
+    int[] histogram = new int[256];
+    int n = 0;
+    for (int i = 0; i < px.length; i++) {
+      if (bin[i] != 0) {
+        histogram[px[i] & 0xff]++;
+        n++;
+      }
+    }
+    int ground = 255;
+    for (int v = 0, seen = 0; v < 256; v++) {
+      seen += histogram[v];
+      if (seen * 2 >= n) {
+        ground = v;
+        break;
+      }
+    }
+    Mat keepCopy = roi.clone();
+    strip.setTo(new Scalar(ground));
+    keepCopy.copyTo(strip.submat(inner));
+    keepCopy.release();
+    binary.release();
+    roi.release();
   }
 }
