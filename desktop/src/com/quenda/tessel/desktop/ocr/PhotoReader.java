@@ -1,0 +1,200 @@
+package com.quenda.tessel.desktop.ocr;
+
+import com.quenda.tessel.desktop.ExitStatus;
+import com.quenda.tessel.desktop.HostException;
+import com.quenda.tessel.desktop.ocr.TsvPages.Word;
+import java.util.ArrayList;
+import java.util.Comparator;
+import java.util.List;
+import java.util.Locale;
+import org.opencv.core.CvType;
+import org.opencv.core.Mat;
+import org.opencv.core.Point;
+import org.opencv.core.RotatedRect;
+import org.opencv.core.Size;
+import org.opencv.imgproc.Imgproc;
+
+/**
+ * Reads the text lines of a photograph: finds them first (the recogniser's own page layout fails
+ * on tilted lines and busy photographs), then straightens each line and has the {@code tesseract}
+ * program read all of them as single lines in one run.
+ *
+ * <p>Orientation: a line read badly is read again turned by 180°, and the better reading kept (an
+ * upside-down page or sign); when fewer than two lines are read from a picture with many letter
+ * candidates, the recogniser's orientation detection is asked about the whole picture and, if it
+ * is confident of a quarter or half turn, the picture is read again turned upright (a page held
+ * sideways, whose vertical lines the line finder does not look for). A line's angle then gives its
+ * reading direction: about 90 for text running down, about 180 for text upside down.
+ */
+public final class PhotoReader implements AutoCloseable {
+  public static final long DEFAULT_TIMEOUT_MILLIS = 60_000;
+  /** Detection runs on at most this many pixels across; strips are cut at full resolution. */
+  static final int DETECTION_SIZE = 1600;
+
+  private final TesseractProgram program;
+  private final StripRecognizer recognizer;
+  private final boolean canDetectOrientation;
+
+  public PhotoReader(String tesseractLanguage) throws HostException {
+    this(tesseractLanguage, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS);
+  }
+
+  /** With another program or time limit per run of it (tests stand in a hanging program). */
+  PhotoReader(String tesseractLanguage, String programPath, long timeoutMillis)
+      throws HostException {
+    program = new TesseractProgram(programPath, timeoutMillis);
+    List<String> installed = program.languages();
+    for (String lang : tesseractLanguage.split("\\+")) {
+      if (!installed.contains(lang)) {
+        throw new HostException(ExitStatus.MISSING_OCR_DATA,
+            "no OCR data for language '" + lang + "': install the Debian package "
+                + debianPackage(lang));
+      }
+    }
+    recognizer = new StripRecognizer(program, tesseractLanguage);
+    canDetectOrientation = installed.contains("osd");
+  }
+
+  /** tesseract-ocr-chi-sim for chi_sim. */
+  static String debianPackage(String lang) {
+    return "tesseract-ocr-" + lang.replace('_', '-').toLowerCase(Locale.ROOT);
+  }
+
+  /** The text lines of an 8-bit RGB picture, top to bottom. */
+  public List<RecognizedLine> read(Mat rgb) throws HostException {
+    if (rgb.empty() || rgb.type() != CvType.CV_8UC3) {
+      throw new HostException(
+          ExitStatus.INTERNAL, "OCR needs a non-empty 8-bit RGB picture, got " + rgb);
+    }
+    Mat grey = new Mat();
+    Imgproc.cvtColor(rgb, grey, Imgproc.COLOR_RGB2GRAY);
+    try {
+      Reading upright = readGrey(grey);
+      if (upright.lines.size() < 2 && upright.candidates >= 20 && canDetectOrientation) {
+        int turn = PageOrientation.clockwiseTurn(program, grey);
+        if (turn != 0) {
+          Mat turned = PageOrientation.turn(grey, turn);
+          Reading again = readGrey(turned);
+          turned.release();
+          if (again.lines.size() > upright.lines.size()) {
+            return sorted(turnBack(again.lines, turn, grey.cols(), grey.rows()));
+          }
+        }
+      }
+      return sorted(upright.lines);
+    } finally {
+      grey.release();
+    }
+  }
+
+  @Override
+  public void close() {}
+
+  private record Reading(List<RecognizedLine> lines, int candidates) {}
+
+  private Reading readGrey(Mat grey) throws HostException {
+    double f = Math.min(1.0, DETECTION_SIZE / (double) Math.max(grey.cols(), grey.rows()));
+    Mat small = grey;
+    if (f < 1) {
+      small = new Mat();
+      Imgproc.resize(grey, small, new Size(), f, f, Imgproc.INTER_AREA);
+    }
+    List<Component> components = new CharacterDetector((int) small.total()).detect(small);
+    List<TextLine> lines = new LineGrouper().group(components);
+    if (small != grey) {
+      small.release();
+    }
+    for (Component c : components) {
+      c.points.release();
+    }
+    List<RotatedRect> rects = new ArrayList<>();
+    for (TextLine l : lines) {
+      rects.add(new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
+          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle));
+    }
+    List<List<Word>> words = recognise(grey, lines, rects, false);
+    List<Integer> retry = new ArrayList<>();
+    List<RecognizedLine> out = new ArrayList<>();
+    for (int i = 0; i < lines.size(); i++) {
+      List<Word> w = TextFilter.trim(words.get(i));
+      if (TextFilter.isText(w)) {
+        out.add(new RecognizedLine(TextFilter.text(w), rects.get(i), TextFilter.confidence(w)));
+      } else if (lines.get(i).parts.size() >= 3) {
+        retry.add(i);
+      }
+    }
+    List<TextLine> retryLines = new ArrayList<>();
+    List<RotatedRect> retryRects = new ArrayList<>();
+    for (int i : retry) {
+      retryLines.add(lines.get(i));
+      retryRects.add(rects.get(i));
+    }
+    List<List<Word>> turned = recognise(grey, retryLines, retryRects, true);
+    for (int k = 0; k < retry.size(); k++) {
+      List<Word> w = TextFilter.trim(turned.get(k));
+      if (TextFilter.isText(w)) {
+        RotatedRect r = retryRects.get(k);
+        out.add(new RecognizedLine(TextFilter.text(w),
+            new RotatedRect(r.center, r.size, reverse(r.angle)), TextFilter.confidence(w)));
+      }
+    }
+    return new Reading(out, components.size());
+  }
+
+  private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,
+      boolean upsideDown) throws HostException {
+    List<Mat> strips = new ArrayList<>();
+    for (int i = 0; i < lines.size(); i++) {
+      strips.add(LineRectifier.strip(grey, rects.get(i), lines.get(i).bright, upsideDown));
+    }
+    try {
+      return recognizer.read(strips);
+    } finally {
+      for (Mat s : strips) {
+        s.release();
+      }
+    }
+  }
+
+  /** The angle of the same line read the other way, in (-180, 180]. */
+  static double reverse(double angle) {
+    double a = angle + 180;
+    return a > 180 ? a - 360 : a;
+  }
+
+  /**
+   * Lines read in a picture turned clockwise by {@code turn}, brought back to the original
+   * picture of {@code width}×{@code height}.
+   */
+  static List<RecognizedLine> turnBack(
+      List<RecognizedLine> lines, int turn, int width, int height) {
+    List<RecognizedLine> out = new ArrayList<>();
+    for (RecognizedLine l : lines) {
+      double x = l.rect.center.x;
+      double y = l.rect.center.y;
+      Point c;
+      switch (turn) {
+        case 90: // (x, y) went to (height - 1 - y, x)
+          c = new Point(y, height - 1 - x);
+          break;
+        case 180:
+          c = new Point(width - 1 - x, height - 1 - y);
+          break;
+        default: // 270: (x, y) went to (y, width - 1 - x)
+          c = new Point(width - 1 - y, x);
+      }
+      double a = l.rect.angle - turn;
+      while (a <= -180) {
+        a += 360;
+      }
+      out.add(new RecognizedLine(l.text, new RotatedRect(c, l.rect.size, a), l.confidence));
+    }
+    return out;
+  }
+
+  private static List<RecognizedLine> sorted(List<RecognizedLine> lines) {
+    lines.sort(Comparator.comparingDouble((RecognizedLine l) -> l.rect.center.y)
+                   .thenComparingDouble(l -> l.rect.center.x));
+    return lines;
+  }
+}
