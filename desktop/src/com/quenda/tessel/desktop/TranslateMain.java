@@ -31,7 +31,7 @@ public final class TranslateMain {
     String fd = System.getenv("TRANSLATE_REPORT_FD");
     if (fd != null && fd.matches("\\d+")) {
       try {
-        return new FileOutputStream("/dev/fd/" + fd);
+        return new FileOutputStream("/dev/fd/" + fd, true);
       } catch (FileNotFoundException e) {
         // Not open after all: standard output it is.
       }

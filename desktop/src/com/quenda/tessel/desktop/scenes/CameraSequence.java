@@ -76,10 +76,7 @@ public final class CameraSequence {
    */
   public List<SceneLine> truth(int k) {
     Pose pose = pose(k);
-    Mat transform = sceneToFrame(k);
-    double[] m = new double[6];
-    transform.get(0, 0, m);
-    transform.release();
+    double[] m = affine(k);
     List<SceneLine> lines = new ArrayList<>();
     for (SceneLine line : scene.lines) {
       Point c = line.rect.center;
@@ -90,6 +87,27 @@ public final class CameraSequence {
       lines.add(inside(moved) ? new SceneLine(line.text, moved) : null);
     }
     return lines;
+  }
+
+  /** Where the scene point seen at {@code p} in frame {@code from} is seen in frame {@code to}. */
+  public Point carry(Point p, int from, int to) {
+    double[] a = affine(from);
+    double[] b = affine(to);
+    // Invert frame "from"'s similarity, then apply frame "to"'s.
+    double det = a[0] * a[4] - a[1] * a[3];
+    double x = p.x - a[2];
+    double y = p.y - a[5];
+    double sx = (a[4] * x - a[1] * y) / det;
+    double sy = (-a[3] * x + a[0] * y) / det;
+    return new Point(b[0] * sx + b[1] * sy + b[2], b[3] * sx + b[4] * sy + b[5]);
+  }
+
+  private double[] affine(int k) {
+    Mat transform = sceneToFrame(k);
+    double[] m = new double[6];
+    transform.get(0, 0, m);
+    transform.release();
+    return m;
   }
 
   // A camera rolled by r degrees sees the scene turned by r degrees, clockwise on screen.

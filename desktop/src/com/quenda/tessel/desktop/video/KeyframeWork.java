@@ -3,9 +3,11 @@ package com.quenda.tessel.desktop.video;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.engine.Eraser;
+import com.quenda.tessel.desktop.engine.FontChoice;
 import com.quenda.tessel.desktop.engine.FrameMeans;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
+import com.quenda.tessel.desktop.photo.StrokeWeight;
 import com.quenda.tessel.desktop.translate.Translator;
 import java.util.ArrayList;
 import java.util.HashMap;
@@ -21,30 +23,14 @@ import org.opencv.core.RotatedRect;
  * thread, while frames keep coming; it touches no renderer state.
  */
 final class KeyframeWork {
-  /** What one keyframe gave: the lines, their translations (null: failed), patches for those. */
-  static final class Result {
-    final int frame;
-    final List<RecognizedLine> lines;
-    final List<String> translations;
-    /** One patch per translated line, in order. */
-    final Eraser.Patches patches;
-    final double[] means;
-    final double ocrMillis;
-    final double translateMillis;
-    final double eraseMillis;
-
-    Result(int frame, List<RecognizedLine> lines, List<String> translations, Eraser.Patches patches,
-        double[] means, double ocrMillis, double translateMillis, double eraseMillis) {
-      this.frame = frame;
-      this.lines = lines;
-      this.translations = translations;
-      this.patches = patches;
-      this.means = means;
-      this.ocrMillis = ocrMillis;
-      this.translateMillis = translateMillis;
-      this.eraseMillis = eraseMillis;
-    }
-  }
+  /**
+   * What one keyframe gave: the lines, their translations (null: failed), one patch per translated
+   * line in order with the frame's mean colours under them, the stage times, and the weight of the
+   * translated lines' strokes (for the font).
+   */
+  record Result(int frame, List<RecognizedLine> lines, List<String> translations,
+      Eraser.Patches patches, double[] means, double ocrMillis, double translateMillis,
+      double eraseMillis, FontChoice.Weight weight) {}
 
   private final PhotoReader reader;
   private final Translator translator;
@@ -78,7 +64,8 @@ final class KeyframeWork {
     double[] means = FrameMeans.under(rgb, patches.patchRects);
     long end = System.nanoTime();
     return new Result(frame, lines, translations, patches, means, (read - start) / 1e6,
-        (translatedAt - read) / 1e6, (end - translatedAt) / 1e6);
+        (translatedAt - read) / 1e6, (end - translatedAt) / 1e6,
+        FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects)));
   }
 
   private List<String> translate(List<RecognizedLine> lines) throws HostException {

@@ -11,6 +11,7 @@ import org.opencv.core.RotatedRect;
  */
 final class ShownLine {
   final long id;
+  final int keyframe;
   final RecognizedLine read;
   final String translation;
   /** Where the line is in the current frame; null while the tracker has lost it. */
@@ -21,8 +22,9 @@ final class ShownLine {
   /** The frame's mean R, G, B under the patch when it was cut. */
   double[] referenceMeans;
 
-  ShownLine(long id, RecognizedLine read, String translation) {
+  ShownLine(long id, int keyframe, RecognizedLine read, String translation) {
     this.id = id;
+    this.keyframe = keyframe;
     this.read = read;
     this.translation = translation;
     this.rect = read.rect;

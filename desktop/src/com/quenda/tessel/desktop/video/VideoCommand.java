@@ -35,7 +35,7 @@ public final class VideoCommand {
       PrintStream out, PrintStream err) throws HostException {
     Progress progress = new Progress(source.frameCountHint(), command.quiet, err);
     try (OutputFiles files = new OutputFiles(command.out);
-         VideoSink sink = new VideoSink(files, source.name(), source.fps())) {
+         VideoSink sink = new VideoSink(files, source.name(), source.fps(), command.live)) {
       VideoResult result;
       try {
         result = job.run(source, sink, progress);

@@ -13,7 +13,6 @@ import com.quenda.tessel.desktop.engine.Rects;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.photo.LineResult;
-import com.quenda.tessel.desktop.photo.StrokeWeight;
 import com.quenda.tessel.desktop.translate.Translator;
 import com.quenda.tessel.tracking.TrackingJNI;
 import java.util.ArrayList;
@@ -21,10 +20,12 @@ import java.util.Arrays;
 import java.util.LinkedHashMap;
 import java.util.List;
 import java.util.Map;
+import java.util.concurrent.BlockingQueue;
 import java.util.concurrent.ExecutionException;
 import java.util.concurrent.ExecutorService;
 import java.util.concurrent.Executors;
 import java.util.concurrent.Future;
+import java.util.concurrent.LinkedBlockingQueue;
 import org.opencv.core.Mat;
 import org.opencv.core.RotatedRect;
 import org.opencv.imgproc.Imgproc;
@@ -42,15 +43,20 @@ import org.opencv.imgproc.Imgproc;
  * </ol>
  *
  * <p>Offline, a keyframe's work runs in line and holds its frame up. Live, frames arrive at the
- * source's rate and are never held up: the keyframe's work runs on a worker thread, the frames
- * that arrive meanwhile are kept, and when the result for frame k arrives at frame k+m a tracker
- * started on frame k with the result's rectangles is run through frames k+1..k+m, which brings
- * the rectangles to frame k+m before they are drawn. Until the first result, frames pass through.
+ * source's rate and are never held up: the keyframe's work runs on a worker thread, and the frames
+ * that arrive meanwhile are queued for it. When its result for frame k is ready, the worker starts
+ * a tracker on frame k with the result's rectangles and runs it through the queued frames k+1..;
+ * the frame loop, at frame k+m, runs it through what was queued since and through frame k+m, which
+ * brings the rectangles to frame k+m before they are drawn. Until the first result, frames pass
+ * through untouched.
  */
 public final class VideoJob {
-  // Frames kept for catching up while a live keyframe is worked on: 8 s at 30 fps. A result later
+  // Frames queued for catching up while a live keyframe is worked on: 8 s at 30 fps. A result later
   // than that is dropped and a new keyframe taken.
   private static final int MAX_CATCH_UP_FRAMES = 240;
+
+  /** A live keyframe's result with its tracker, run through the frames queued meanwhile. */
+  private record CaughtUp(KeyframeWork.Result result, long tracker, double[] rects) {}
 
   private final KeyframeWork work;
   private final Language target;
@@ -95,9 +101,9 @@ public final class VideoJob {
     private boolean fontChosen;
 
     // Live: the keyframe being worked on, the reason it was taken, and the frames since.
-    private Future<KeyframeWork.Result> pending;
+    private Future<CaughtUp> pending;
     private String pendingReason;
-    private final List<Mat> catchUp = new ArrayList<>();
+    private BlockingQueue<Mat> catchUp = new LinkedBlockingQueue<>();
     private long startNanos;
 
     Loop(FrameSource source, VideoSink sink, Progress progress) {
@@ -219,18 +225,44 @@ public final class VideoJob {
 
     private void takeKeyframe(Mat frame, int k, String reason) throws HostException {
       lastKeyframe = k;
-      if (live) {
-        Mat copy = frame.clone();
-        catchUp.add(copy);
-        pendingReason = reason;
-        pending = worker.submit(() -> work.run(copy, k));
+      if (!live) {
+        KeyframeWork.Result result = work.run(frame, k);
+        install(result, reason, frame, startTracker(frame, result), null);
         return;
       }
-      KeyframeWork.Result result = work.run(frame, k);
-      install(result, reason, frame, null);
+      Mat copy = frame.clone();
+      BlockingQueue<Mat> queue = new LinkedBlockingQueue<>();
+      catchUp = queue;
+      pendingReason = reason;
+      pending = worker.submit(() -> {
+        try {
+          return catchUpOnWorker(work.run(copy, k), copy, queue);
+        } finally {
+          copy.release();
+        }
+      });
     }
 
-    /** Live: takes a finished keyframe result, catching its rectangles up to this frame. */
+    /**
+     * Worker side of a live keyframe: a tracker on the keyframe's frame, run through every frame
+     * queued since; the frame loop takes over with the frames queued after the last one here.
+     */
+    private CaughtUp catchUpOnWorker(
+        KeyframeWork.Result result, Mat keyframe, BlockingQueue<Mat> queue) {
+      long tracker = startTracker(keyframe, result);
+      double[] rects = null;
+      long start = System.nanoTime();
+      for (Mat later = queue.poll(); later != null; later = queue.poll()) {
+        if (tracker != 0) {
+          rects = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+        }
+        later.release();
+      }
+      timings.add("catch-up on the worker", (System.nanoTime() - start) / 1e6);
+      return new CaughtUp(result, tracker, rects);
+    }
+
+    /** Live: takes a finished keyframe and brings its rectangles to this frame. */
     private void installFinishedWork(Mat frame, int k) throws HostException {
       if (pending == null) {
         return;
@@ -244,71 +276,77 @@ public final class VideoJob {
         }
         return;
       }
-      KeyframeWork.Result result = result(pending);
+      CaughtUp caughtUp = result(pending);
       pending = null;
-      catchUp.add(frame.clone());
-      install(result, pendingReason, catchUp.get(0), catchUp.subList(1, catchUp.size()));
-      releaseCatchUp();
-      latencies.add((System.nanoTime() - arrivalNanos(result.frame)) / 1e6);
+      long start = System.nanoTime();
+      double[] rects = caughtUp.rects();
+      for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
+        if (caughtUp.tracker() != 0) {
+          rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
+        }
+        later.release();
+      }
+      if (caughtUp.tracker() != 0) {
+        rects = TrackingJNI.updateTracker(caughtUp.tracker(), frame.getNativeObjAddr());
+      }
+      timings.add("catch-up", (System.nanoTime() - start) / 1e6);
+      install(caughtUp.result(), pendingReason, frame, caughtUp.tracker(), rects);
+      latencies.add((System.nanoTime() - arrivalNanos(caughtUp.result().frame())) / 1e6);
     }
 
     /**
-     * Makes a keyframe's lines the shown ones: a new tracker on the keyframe's frame (brought
-     * through {@code laterFrames} when live), ids kept for lines found again.
+     * Makes a keyframe's lines the shown ones, tracked by {@code newTracker}, at {@code rects} in
+     * {@code frame} when given (live), else where they were read; ids kept for lines found again.
      */
-    private void install(KeyframeWork.Result result, String reason, Mat keyframe,
-        List<Mat> laterFrames) throws HostException {
-      timings.add("ocr", result.ocrMillis);
-      timings.add("translate", result.translateMillis);
-      timings.add("erase", result.eraseMillis);
+    private void install(KeyframeWork.Result result, String reason, Mat frame, long newTracker,
+        double[] rects) throws HostException {
+      timings.add("ocr", result.ocrMillis());
+      timings.add("translate", result.translateMillis());
+      timings.add("erase", result.eraseMillis());
       keyframes.add(keyframeJson(result, reason));
 
       List<ShownLine> next = new ArrayList<>();
-      for (int i = 0, p = 0; i < result.lines.size(); i++) {
-        RecognizedLine line = result.lines.get(i);
-        String translation = result.translations.get(i);
+      for (int i = 0, p = 0; i < result.lines().size(); i++) {
+        RecognizedLine line = result.lines().get(i);
+        String translation = result.translations().get(i);
         if (translation == null) {
           continue;
         }
-        ShownLine shownLine = new ShownLine(idFor(line), line, translation);
-        shownLine.replacePatch(result.patches.overlays.get(p), result.patches.colors[p], line.rect,
-            Arrays.copyOfRange(result.means, 3 * p, 3 * p + 3));
+        ShownLine shownLine = new ShownLine(idFor(line), result.frame(), line, translation);
+        shownLine.replacePatch(result.patches().overlays.get(p), result.patches().colors[p],
+            line.rect, Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
         next.add(shownLine);
         ++p;
       }
       releaseShown();
       shown = next;
-      chooseFont(keyframe);
-      startTracker(keyframe, laterFrames);
-    }
-
-    private void startTracker(Mat keyframe, List<Mat> laterFrames) {
       if (tracker != 0) {
         TrackingJNI.releaseTracker(tracker);
-        tracker = 0;
+      }
+      tracker = newTracker;
+      if (rects != null) {
+        applyTracked(rects);
       }
       if (keyframeRgba != null) {
         keyframeRgba.release();
       }
+      // The reference for the view-change rule: the view the overlays were placed in.
       keyframeRgba = new Mat();
-      Imgproc.cvtColor(keyframe, keyframeRgba, Imgproc.COLOR_RGB2RGBA);
-      if (shown.isEmpty()) {
-        return;
-      }
+      Imgproc.cvtColor(frame, keyframeRgba, Imgproc.COLOR_RGB2RGBA);
+      chooseFont(frame, result.weight());
+    }
+
+    /** A tracker of the result's translated lines on the frame they were read in; 0 for none. */
+    private long startTracker(Mat keyframe, KeyframeWork.Result result) {
       List<RotatedRect> rects = new ArrayList<>();
-      for (ShownLine line : shown) {
-        rects.add(line.read.rect);
-      }
-      tracker = TrackingJNI.initializeTracker(keyframe.getNativeObjAddr(), Rects.pack(rects));
-      if (laterFrames != null && !laterFrames.isEmpty()) {
-        long start = System.nanoTime();
-        double[] moved = null;
-        for (Mat later : laterFrames) {
-          moved = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+      for (int i = 0; i < result.lines().size(); i++) {
+        if (result.translations().get(i) != null) {
+          rects.add(result.lines().get(i).rect);
         }
-        applyTracked(moved);
-        timings.add("catch-up", (System.nanoTime() - start) / 1e6);
       }
+      return rects.isEmpty()
+          ? 0
+          : TrackingJNI.initializeTracker(keyframe.getNativeObjAddr(), Rects.pack(rects));
     }
 
     /** An old line's id when the same text stands in about the same place. */
@@ -326,16 +364,11 @@ public final class VideoJob {
       return nextId++;
     }
 
-    private void chooseFont(Mat keyframe) throws HostException {
+    private void chooseFont(Mat frame, FontChoice.Weight weight) throws HostException {
       if (fontChosen || shown.isEmpty()) {
         return;
       }
-      List<RotatedRect> rects = new ArrayList<>();
-      for (ShownLine line : shown) {
-        rects.add(line.read.rect);
-      }
-      drawer(keyframe).setLanguage(
-          target, FontChoice.weightOf(StrokeWeight.medianRatio(keyframe, rects)));
+      drawer(frame).setLanguage(target, weight);
       fontChosen = true;
     }
 
@@ -383,7 +416,8 @@ public final class VideoJob {
       List<ShownLine> visible = visible();
       List<FrameRecord.Drawn> drawnLines = new ArrayList<>();
       for (ShownLine line : visible) {
-        drawnLines.add(new FrameRecord.Drawn(line.id, line.read.text, line.translation, line.rect));
+        drawnLines.add(new FrameRecord.Drawn(
+            line.id, line.read.text, line.translation, line.rect, line.keyframe, line.read.rect));
       }
       records.add(new FrameRecord(k, drawnLines));
       if (visible.isEmpty()) {
@@ -446,14 +480,14 @@ public final class VideoJob {
 
     private Map<String, Object> keyframeJson(KeyframeWork.Result result, String reason) {
       List<Object> lines = new ArrayList<>();
-      for (int i = 0, p = 0; i < result.lines.size(); i++) {
-        boolean translated = result.translations.get(i) != null;
-        lines.add(new LineResult(result.lines.get(i), result.translations.get(i),
-            translated ? result.patches.colors[p++] : 0)
+      for (int i = 0, p = 0; i < result.lines().size(); i++) {
+        boolean translated = result.translations().get(i) != null;
+        lines.add(new LineResult(result.lines().get(i), result.translations().get(i),
+            translated ? result.patches().colors[p++] : 0)
                       .json());
       }
       Map<String, Object> json = new LinkedHashMap<>();
-      json.put("frame", result.frame);
+      json.put("frame", result.frame());
       json.put("reason", reason);
       json.put("lines", lines);
       return json;
@@ -477,8 +511,9 @@ public final class VideoJob {
     }
 
     private void releaseCatchUp() {
-      catchUp.forEach(Mat::release);
-      catchUp.clear();
+      for (Mat frame = catchUp.poll(); frame != null; frame = catchUp.poll()) {
+        frame.release();
+      }
     }
 
     private void releaseShown() {
@@ -488,6 +523,17 @@ public final class VideoJob {
     void release() {
       if (worker != null) {
         worker.shutdownNow();
+        try {
+          if (pending != null) {
+            CaughtUp late = pending.get();
+            late.result().patches().release();
+            if (late.tracker() != 0) {
+              TrackingJNI.releaseTracker(late.tracker());
+            }
+          }
+        } catch (InterruptedException | ExecutionException | RuntimeException e) {
+          // The worker failed or was stopped; it holds nothing more to free.
+        }
       }
       releaseCatchUp();
       releaseShown();
@@ -503,8 +549,7 @@ public final class VideoJob {
     }
   }
 
-  private static KeyframeWork.Result result(Future<KeyframeWork.Result> future)
-      throws HostException {
+  private static CaughtUp result(Future<CaughtUp> future) throws HostException {
     try {
       return future.get();
     } catch (ExecutionException e) {
