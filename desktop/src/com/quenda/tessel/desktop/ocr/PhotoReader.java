@@ -104,9 +104,6 @@ public final class PhotoReader implements AutoCloseable {
     if (small != grey) {
       small.release();
     }
-    for (Component c : components) {
-      c.points.release();
-    }
     List<RotatedRect> rects = new ArrayList<>();
     for (TextLine l : lines) {
       rects.add(new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
@@ -118,7 +115,7 @@ public final class PhotoReader implements AutoCloseable {
     for (int i = 0; i < lines.size(); i++) {
       List<Word> w = TextFilter.trim(words.get(i));
       if (TextFilter.isText(w)) {
-        out.add(new RecognizedLine(TextFilter.text(w), rects.get(i), TextFilter.confidence(w)));
+        out.add(result(lines.get(i), rects.get(i), w, false, f));
       } else if (lines.get(i).parts.size() >= 3) {
         retry.add(i);
       }
@@ -133,12 +130,52 @@ public final class PhotoReader implements AutoCloseable {
     for (int k = 0; k < retry.size(); k++) {
       List<Word> w = TextFilter.trim(turned.get(k));
       if (TextFilter.isText(w)) {
-        RotatedRect r = retryRects.get(k);
-        out.add(new RecognizedLine(TextFilter.text(w),
-            new RotatedRect(r.center, r.size, reverse(r.angle)), TextFilter.confidence(w)));
+        out.add(result(retryLines.get(k), retryRects.get(k), w, true, f));
       }
     }
+    for (Component c : components) {
+      c.points.release();
+    }
     return new Reading(out, components.size());
+  }
+
+  /**
+   * The line as read. When the words kept span less than the line (a fragment of a plate's edge
+   * or texture joined the row but was not read as text), the rectangle is remade from the
+   * candidates under the words.
+   */
+  private static RecognizedLine result(
+      TextLine line, RotatedRect rect, List<Word> words, boolean upsideDown, double f) {
+    double from = Double.MAX_VALUE;
+    double to = -Double.MAX_VALUE;
+    for (Word w : words) {
+      double a = LineRectifier.alongLine(rect, w.left(), upsideDown);
+      double b = LineRectifier.alongLine(rect, w.left() + w.width(), upsideDown);
+      from = Math.min(from, Math.min(a, b));
+      to = Math.max(to, Math.max(a, b));
+    }
+    double slack = 0.3 * rect.size.height;
+    RotatedRect r = rect;
+    if (from > -rect.size.width / 2 + slack || to < rect.size.width / 2 - slack) {
+      double t = Math.toRadians(line.rect.angle);
+      List<Component> under = new ArrayList<>();
+      for (Component c : line.parts) {
+        double u = ((c.cx() - line.rect.center.x) * Math.cos(t)
+                       + (c.cy() - line.rect.center.y) * Math.sin(t))
+            / f;
+        if (u >= from - slack && u <= to + slack) {
+          under.add(c);
+        }
+      }
+      RotatedRect ink = under.isEmpty() ? null : InkRect.of(under, line.rect.angle);
+      if (ink != null && under.size() < line.parts.size()) {
+        r = new RotatedRect(new Point(ink.center.x / f, ink.center.y / f),
+            new Size(ink.size.width / f, ink.size.height / f), ink.angle);
+      }
+    }
+    double angle = upsideDown ? reverse(r.angle) : r.angle;
+    return new RecognizedLine(TextFilter.text(words), new RotatedRect(r.center, r.size, angle),
+        TextFilter.confidence(words));
   }
 
   private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,
