@@ -56,6 +56,27 @@ final class LineGrouper {
   }
 
   /**
+   * How many candidates stand in linked rows of three or more, without fitting the rows: evidence
+   * of how much text runs across the picture, cheap enough to compare with its transposition.
+   */
+  static int candidatesInRows(List<Component> components) {
+    int n = 0;
+    for (boolean bright : new boolean[] {false, true}) {
+      List<Component> same = new ArrayList<>();
+      for (Component c : components) {
+        if (c.bright == bright) {
+          same.add(c);
+        }
+      }
+      same.sort(Comparator.comparingInt(c -> c.box.x));
+      for (List<Component> g : link(same, Double.NaN)) {
+        n += g.size() >= 3 ? g.size() : 0;
+      }
+    }
+    return n;
+  }
+
+  /**
    * Groups linked candidates (sorted by left edge); with a direction, a link must also lie within
    * MAX_REFIT_ANGLE of it. Groups of one are dropped.
    */
