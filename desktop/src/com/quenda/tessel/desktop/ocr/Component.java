@@ -5,6 +5,7 @@ import org.opencv.core.Rect;
 
 /** A character candidate: one stable region of one polarity, in detection-scale pixels. */
 final class Component {
+  /** Null for a {@link #transposed} copy. */
   final MatOfPoint points;
   final Rect box;
   final int area;
@@ -16,6 +17,18 @@ final class Component {
     this.box = box;
     this.area = points.rows();
     this.bright = bright;
+  }
+
+  private Component(Rect box, int area, boolean bright) {
+    this.points = null;
+    this.box = box;
+    this.area = area;
+    this.bright = bright;
+  }
+
+  /** The candidate mirrored across the diagonal, box only: rows of it are columns of this. */
+  Component transposed() {
+    return new Component(new Rect(box.y, box.x, box.height, box.width), area, bright);
   }
 
   private int[] xy;

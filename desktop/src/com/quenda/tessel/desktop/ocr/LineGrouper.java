@@ -25,8 +25,8 @@ import org.opencv.imgproc.Imgproc;
  * above and below, on a page, do not. Second, each linked group's direction is fitted through its
  * centres and the links are redone within 20° of it, which cuts groups that bridged two lines.
  *
- * <p>Rows narrower than 1.3 times their height are dropped (a lone letter or texture blob); the
- * rectangle is {@link InkRect}'s.
+ * <p>Rows of fewer than three candidates (two blobs always line up) or narrower than 1.3 times
+ * their height are dropped; the rectangle is {@link InkRect}'s.
  */
 final class LineGrouper {
   private static final double MAX_LINK_ANGLE = 40;
@@ -53,6 +53,27 @@ final class LineGrouper {
       }
     }
     return dropOverlaps(lines);
+  }
+
+  /**
+   * How many candidates stand in linked rows of three or more, without fitting the rows: evidence
+   * of how much text runs across the picture, cheap enough to compare with its transposition.
+   */
+  static int candidatesInRows(List<Component> components) {
+    int n = 0;
+    for (boolean bright : new boolean[] {false, true}) {
+      List<Component> same = new ArrayList<>();
+      for (Component c : components) {
+        if (c.bright == bright) {
+          same.add(c);
+        }
+      }
+      same.sort(Comparator.comparingInt(c -> c.box.x));
+      for (List<Component> g : link(same, Double.NaN)) {
+        n += g.size() >= 3 ? g.size() : 0;
+      }
+    }
+    return n;
   }
 
   /**
@@ -129,7 +150,7 @@ final class LineGrouper {
 
   private static TextLine line(List<Component> all, double direction, boolean bright) {
     List<Component> row = withoutTallOutliers(all);
-    if (row.size() < 2) {
+    if (row.size() < 3) {
       return null;
     }
     RotatedRect r = InkRect.of(row, direction);
@@ -161,11 +182,14 @@ final class LineGrouper {
   }
 
   /**
-   * Where two lines overlap by more than 40% of the smaller, keeps the one with more ink: the
-   * counters and gaps of light letters make a fainter dark row inside the light one.
+   * Where two lines overlap by more than 40% of the smaller, keeps the one with more candidates:
+   * the counters of light letters make a row of fewer dark candidates inside the light one, and
+   * a few large blobs of the backdrop (shadows, a plate's shape) can make a row around a sign.
    */
   private static List<TextLine> dropOverlaps(List<TextLine> lines) {
-    lines.sort(Comparator.comparingLong(TextLine::inkArea).reversed());
+    lines.sort(Comparator.comparingInt((TextLine l) -> l.parts.size())
+                   .thenComparingLong(TextLine::inkArea)
+                   .reversed());
     List<TextLine> kept = new ArrayList<>();
     for (TextLine l : lines) {
       boolean covered = false;

@@ -23,10 +23,26 @@ final class LineRectifier {
 
   private LineRectifier() {}
 
+  static double scale(RotatedRect rect) {
+    return Math.max(0.25, Math.min(5, INK_HEIGHT / Math.max(1, rect.size.height)));
+  }
+
+  /**
+   * Where column {@code x} of the line's strip lies along the line, in the picture's pixels from
+   * the rectangle's centre towards its reading end.
+   */
+  static double alongLine(RotatedRect rect, double x, boolean upsideDown) {
+    double scale = scale(rect);
+    double h = Math.max(1, rect.size.height);
+    int width = (int) Math.ceil((rect.size.width + h) * scale);
+    double u = (x - width / 2.0) / scale;
+    return upsideDown ? -u : u;
+  }
+
   /** {@code rect} in the grey picture's pixels; {@code upsideDown} turns the strip by 180°. */
   static Mat strip(Mat grey, RotatedRect rect, boolean bright, boolean upsideDown) {
     double h = Math.max(1, rect.size.height);
-    double scale = Math.max(0.25, Math.min(5, INK_HEIGHT / h));
+    double scale = scale(rect);
     double margin = 0.5 * h;
     int width = (int) Math.ceil((rect.size.width + 2 * margin) * scale);
     int height = (int) Math.ceil((h + 2 * margin) * scale);

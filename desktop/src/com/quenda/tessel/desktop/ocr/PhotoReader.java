@@ -19,17 +19,22 @@ import org.opencv.imgproc.Imgproc;
  * on tilted lines and busy photographs), then straightens each line and has the {@code tesseract}
  * program read all of them as single lines in one run.
  *
- * <p>Orientation: a line read badly is read again turned by 180°, and the better reading kept (an
- * upside-down page or sign); when fewer than two lines are read from a picture with many letter
- * candidates, the recogniser's orientation detection is asked about the whole picture and, if it
- * is confident of a quarter or half turn, the picture is read again turned upright (a page held
- * sideways, whose vertical lines the line finder does not look for). A line's angle then gives its
- * reading direction: about 90 for text running down, about 180 for text upside down.
+ * <p>Orientation, two cheap rules. Per line: a line not read, or read with a confidence under
+ * {@link #SURE_CONFIDENCE}, is read again turned by 180° in one more run for all such lines, and
+ * the surer reading kept (an upside-down page or sign). Per picture: the line finder only looks
+ * for rows within 40° of horizontal, so before reading, the candidates are also linked as if the
+ * picture were transposed; when far more of them stand in columns than in rows, the picture is
+ * held sideways, the recogniser's orientation detection (page segmentation mode 0) says which way
+ * to turn it, and the turned picture is read (if it cannot tell, a quarter turn clockwise, and the
+ * per-line rule catches the lines that end up upside down). A line's angle then gives its reading
+ * direction: about 90 for text running down, about 180 for text upside down.
  */
 public final class PhotoReader implements AutoCloseable {
   public static final long DEFAULT_TIMEOUT_MILLIS = 60_000;
   /** Detection runs on at most this many pixels across; strips are cut at full resolution. */
   static final int DETECTION_SIZE = 1600;
+  /** Lines read with less confidence are also read turned by 180°. */
+  static final double SURE_CONFIDENCE = 80;
 
   private final TesseractProgram program;
   private final StripRecognizer recognizer;
@@ -69,19 +74,7 @@ public final class PhotoReader implements AutoCloseable {
     Mat grey = new Mat();
     Imgproc.cvtColor(rgb, grey, Imgproc.COLOR_RGB2GRAY);
     try {
-      Reading upright = readGrey(grey);
-      if (upright.lines.size() < 2 && upright.candidates >= 20 && canDetectOrientation) {
-        int turn = PageOrientation.clockwiseTurn(program, grey);
-        if (turn != 0) {
-          Mat turned = PageOrientation.turn(grey, turn);
-          Reading again = readGrey(turned);
-          turned.release();
-          if (again.lines.size() > upright.lines.size()) {
-            return sorted(turnBack(again.lines, turn, grey.cols(), grey.rows()));
-          }
-        }
-      }
-      return sorted(upright.lines);
+      return sorted(readGrey(grey, true));
     } finally {
       grey.release();
     }
@@ -90,9 +83,7 @@ public final class PhotoReader implements AutoCloseable {
   @Override
   public void close() {}
 
-  private record Reading(List<RecognizedLine> lines, int candidates) {}
-
-  private Reading readGrey(Mat grey) throws HostException {
+  private List<RecognizedLine> readGrey(Mat grey, boolean mayTurn) throws HostException {
     double f = Math.min(1.0, DETECTION_SIZE / (double) Math.max(grey.cols(), grey.rows()));
     Mat small = grey;
     if (f < 1) {
@@ -100,26 +91,35 @@ public final class PhotoReader implements AutoCloseable {
       Imgproc.resize(grey, small, new Size(), f, f, Imgproc.INTER_AREA);
     }
     List<Component> components = new CharacterDetector((int) small.total()).detect(small);
-    List<TextLine> lines = new LineGrouper().group(components);
     if (small != grey) {
       small.release();
     }
-    for (Component c : components) {
-      c.points.release();
+    if (mayTurn && sideways(components)) {
+      release(components);
+      int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
+      turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
+      Mat turned = PageOrientation.turn(grey, turn);
+      try {
+        return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
+      } finally {
+        turned.release();
+      }
     }
+    List<TextLine> lines = new LineGrouper().group(components);
     List<RotatedRect> rects = new ArrayList<>();
     for (TextLine l : lines) {
       rects.add(new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
           new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle));
     }
     List<List<Word>> words = recognise(grey, lines, rects, false);
+    RecognizedLine[] best = new RecognizedLine[lines.size()];
     List<Integer> retry = new ArrayList<>();
-    List<RecognizedLine> out = new ArrayList<>();
     for (int i = 0; i < lines.size(); i++) {
       List<Word> w = TextFilter.trim(words.get(i));
       if (TextFilter.isText(w)) {
-        out.add(new RecognizedLine(TextFilter.text(w), rects.get(i), TextFilter.confidence(w)));
-      } else if (lines.get(i).parts.size() >= 3) {
+        best[i] = result(lines.get(i), rects.get(i), w, false, f);
+      }
+      if (best[i] == null || best[i].confidence < SURE_CONFIDENCE) {
         retry.add(i);
       }
     }
@@ -131,14 +131,80 @@ public final class PhotoReader implements AutoCloseable {
     }
     List<List<Word>> turned = recognise(grey, retryLines, retryRects, true);
     for (int k = 0; k < retry.size(); k++) {
+      int i = retry.get(k);
       List<Word> w = TextFilter.trim(turned.get(k));
-      if (TextFilter.isText(w)) {
-        RotatedRect r = retryRects.get(k);
-        out.add(new RecognizedLine(TextFilter.text(w),
-            new RotatedRect(r.center, r.size, reverse(r.angle)), TextFilter.confidence(w)));
+      if (TextFilter.isText(w)
+          && (best[i] == null || TextFilter.confidence(w) > best[i].confidence)) {
+        best[i] = result(retryLines.get(k), retryRects.get(k), w, true, f);
       }
     }
-    return new Reading(out, components.size());
+    List<RecognizedLine> out = new ArrayList<>();
+    for (RecognizedLine l : best) {
+      if (l != null) {
+        out.add(l);
+      }
+    }
+    release(components);
+    return out;
+  }
+
+  /**
+   * A picture held sideways: at least 30 candidates stand in vertical rows, and more than twice as
+   * many as in horizontal ones.
+   */
+  private static boolean sideways(List<Component> components) {
+    List<Component> transposed = new ArrayList<>();
+    for (Component c : components) {
+      transposed.add(c.transposed());
+    }
+    int across = LineGrouper.candidatesInRows(components);
+    int down = LineGrouper.candidatesInRows(transposed);
+    return down >= 30 && down > 2 * across;
+  }
+
+  private static void release(List<Component> components) {
+    for (Component c : components) {
+      c.points.release();
+    }
+  }
+
+  /**
+   * The line as read. When the words kept span less than the line (a fragment of a plate's edge
+   * or texture joined the row but was not read as text), the rectangle is remade from the
+   * candidates under the words.
+   */
+  private static RecognizedLine result(
+      TextLine line, RotatedRect rect, List<Word> words, boolean upsideDown, double f) {
+    double from = Double.MAX_VALUE;
+    double to = -Double.MAX_VALUE;
+    for (Word w : words) {
+      double a = LineRectifier.alongLine(rect, w.left(), upsideDown);
+      double b = LineRectifier.alongLine(rect, w.left() + w.width(), upsideDown);
+      from = Math.min(from, Math.min(a, b));
+      to = Math.max(to, Math.max(a, b));
+    }
+    double slack = 0.3 * rect.size.height;
+    RotatedRect r = rect;
+    if (from > -rect.size.width / 2 + slack || to < rect.size.width / 2 - slack) {
+      double t = Math.toRadians(line.rect.angle);
+      List<Component> under = new ArrayList<>();
+      for (Component c : line.parts) {
+        double u = ((c.cx() - line.rect.center.x) * Math.cos(t)
+                       + (c.cy() - line.rect.center.y) * Math.sin(t))
+            / f;
+        if (u >= from - slack && u <= to + slack) {
+          under.add(c);
+        }
+      }
+      RotatedRect ink = under.isEmpty() ? null : InkRect.of(under, line.rect.angle);
+      if (ink != null && under.size() < line.parts.size()) {
+        r = new RotatedRect(new Point(ink.center.x / f, ink.center.y / f),
+            new Size(ink.size.width / f, ink.size.height / f), ink.angle);
+      }
+    }
+    double angle = upsideDown ? reverse(r.angle) : r.angle;
+    return new RecognizedLine(TextFilter.text(words), new RotatedRect(r.center, r.size, angle),
+        TextFilter.confidence(words));
   }
 
   private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,

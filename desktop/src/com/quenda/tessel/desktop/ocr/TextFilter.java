@@ -7,11 +7,13 @@ import java.util.List;
 /**
  * Decides whether a recognised strip is text. Texture read as a line comes back as a few symbols
  * or one- and two-letter fragments at low confidence, so a line must have a mean word confidence
- * of at least {@link #MIN_CONFIDENCE}, a word of two letters or more, and mostly letters or digits.
+ * of at least {@link #MIN_CONFIDENCE} ({@link #SHORT_CONFIDENCE} for three characters or fewer), a
+ * word of two letters or more, and mostly letters or digits.
  * Edge words without a letter or digit (a plate's border read as "|") are trimmed first.
  */
 final class TextFilter {
   static final double MIN_CONFIDENCE = 55;
+  static final double SHORT_CONFIDENCE = 88;
 
   private TextFilter() {}
 
@@ -67,7 +69,8 @@ final class TextFilter {
         word |= run >= 2;
       }
     }
-    return word && alnum >= 2 * other;
+    // Two or three letters are what texture most often reads as, so they must be read surely.
+    return word && alnum >= 2 * other && (alnum > 3 || confidence(words) >= SHORT_CONFIDENCE);
   }
 
   private static boolean hasAlphanumeric(String s) {

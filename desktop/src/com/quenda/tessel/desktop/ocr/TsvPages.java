@@ -11,7 +11,8 @@ import java.util.Map;
  * : file" notes the program interleaves) are skipped.
  */
 final class TsvPages {
-  record Word(String text, double confidence) {}
+  /** A word, with its left edge and width in the strip's pixels. */
+  record Word(String text, double confidence, int left, int width) {}
 
   private static final int LEVEL_WORD = 5;
 
@@ -31,7 +32,8 @@ final class TsvPages {
       try {
         int page = Integer.parseInt(f[1]);
         double conf = Double.parseDouble(f[10]);
-        pages.computeIfAbsent(page, k -> new ArrayList<>()).add(new Word(text, conf));
+        Word w = new Word(text, conf, Integer.parseInt(f[6]), Integer.parseInt(f[8]));
+        pages.computeIfAbsent(page, k -> new ArrayList<>()).add(w);
       } catch (NumberFormatException e) {
         // Not a word row after all.
       }

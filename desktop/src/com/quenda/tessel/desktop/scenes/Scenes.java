@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.scenes;
 import java.util.LinkedHashMap;
 import java.util.List;
 import java.util.Map;
+import java.util.Random;
 import java.util.function.Supplier;
 
 /**
@@ -21,6 +22,12 @@ public final class Scenes {
       "Dogs are not allowed inside the building.", "The last entry is one hour before closing.",
       "Photographs are allowed without flash.", "Ask our staff if you need help.",
       "Thank you for your visit.");
+
+  /** Short sign phrases. */
+  public static final List<String> SIGN_PHRASES = List.of("Emergency exit", "No parking",
+      "Please keep the door closed", "Open every day from nine to five", "Fresh coffee",
+      "Tickets sold here", "Way out", "Closed on Sunday", "No smoking", "Toilets upstairs",
+      "Please wait here", "Staff only", "Fresh bread every morning", "Mind the step");
 
   private static final Map<String, Supplier<Scene>> BUNDLED = new LinkedHashMap<>();
 
@@ -71,6 +78,26 @@ public final class Scenes {
         .sign("Closed on Sunday", 920, 340, 28, 7, SignStyle.DARK_ON_WHITE)
         .sign("No smoking", 640, 620, 30, -14, SignStyle.WHITE_ON_RED)
         .render("shop");
+  }
+
+  /**
+   * Four signs in the quarters of a 1280×720 street photograph, tilted by the given angles (up to
+   * four), with phrases, sizes, colours and backdrop chosen by {@code seed}.
+   */
+  public static Scene tiltedSigns(long seed, double... angles) {
+    Random r = new Random(seed);
+    Backdrop[] backdrops = Backdrop.values();
+    SignStyle[] styles = SignStyle.values();
+    SignScene scene = new SignScene(WIDTH, HEIGHT, backdrops[r.nextInt(backdrops.length)], seed);
+    for (int i = 0; i < Math.min(4, angles.length); i++) {
+      String phrase = SIGN_PHRASES.get(r.nextInt(SIGN_PHRASES.size()));
+      // Long phrases get smaller letters so that a tilted plate stays inside its quarter.
+      double cap = Math.min(22 + r.nextInt(18), 520.0 / phrase.length());
+      double cx = WIDTH / 4.0 * (1 + 2 * (i % 2)) + r.nextInt(41) - 20;
+      double cy = HEIGHT / 4.0 * (1 + 2 * (i / 2)) + r.nextInt(41) - 20;
+      scene.sign(phrase, cx, cy, cap, angles[i], styles[r.nextInt(styles.length)]);
+    }
+    return scene.render("signs-" + seed);
   }
 
   /** The museum notice as a photographed page turned by {@code rotation} degrees. */
