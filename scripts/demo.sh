@@ -1,10 +1,10 @@
 #!/usr/bin/env bash
 # The main job: builds everything, then translates the bundled photo-like
 # scenes (signs, some tilted, and a printed page) from English into Spanish
-# with real OCR and machine translation, and a notice into Japanese, Chinese
-# and German through phrase tables. Pictures and JSON go to out/; the engine's
-# run on a generated camera sequence (tracking, erasing, drawing) goes to
-# out/sequence/.
+# with real OCR and machine translation, a notice into Japanese, Chinese and
+# German through phrase tables, and a short hand-held camera video into
+# Spanish. Inputs are generated into out/inputs; pictures, videos and JSON go
+# to out/.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -13,7 +13,7 @@ cmake -S . -B build -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
 cmake --build build -j "$(nproc)"
 
 rm -rf out
-mkdir -p out/sequence
+mkdir -p out
 export OCRAR_LOG_FILE="$(pwd)/out/native.log"
 ./build/write-bundled-inputs.sh out/inputs
 echo "== photos, English to Spanish =="
@@ -25,8 +25,7 @@ for lang in ja zh de; do
     --translations "desktop/phrases/demo-$lang.tsv" --out "out/notice-$lang"
 done
 
-echo "== the engine on a generated camera sequence =="
-# The tracker prints each frame's homography; the report keeps it.
-OCRAR_LOG_LEVEL=7 ./build/run-demo.sh "$(pwd)/out/sequence" >out/sequence/report.txt
-tail -n 1 out/sequence/report.txt
-echo "pictures: out/photos, out/notice-{ja,zh,de}, out/sequence; engine log: out/native.log"
+echo "== a hand-held camera video, English to Spanish (offline, then live) =="
+./build/run-translate.sh video out/inputs/camera.mp4 --from en --to es --out out/video
+./build/run-translate.sh video out/inputs/camera.mp4 --from en --to es --out out/video-live --live
+echo "pictures: out/photos, out/notice-{ja,zh,de}, out/video, out/video-live; engine log: out/native.log"

@@ -20,10 +20,10 @@ public final class BundledInputs {
   /** The ten lines of the phrase tables under desktop/phrases. */
   public static final List<String> NOTICE_TEXT =
       List.of("Opening hours: Monday to Friday 9-18", "Please keep this door closed at all times",
-          "Emergency exit", "Platform 3 - trains to the city centre",
+          "Emergency exit", "Platform 3: trains to the city centre",
           "No smoking anywhere in the building", "Tickets are sold at the counter",
           "Fresh coffee and cake served daily until six", "Lost property is on the second floor",
-          "Wet floor - please walk carefully", "Press the button for assistance");
+          "Wet floor, please walk carefully", "Press the button for assistance");
 
   private BundledInputs() {}
 
@@ -41,11 +41,14 @@ public final class BundledInputs {
               .rotation(-2)
               .render("notice"),
         directory);
-    writeVideo(cameraSequence(), new File(directory, "camera.mp4"));
+    writeVideo(cameraSequence(90), new File(directory, "camera.mp4"));
   }
 
-  /** Three seconds of a camera panning, zooming and rolling over the station scene. */
-  public static CameraSequence cameraSequence() {
+  /**
+   * A camera panning, zooming and rolling over the station scene: {@code frames} frames at 30 per
+   * second (90 make the main job's three seconds).
+   */
+  public static CameraSequence cameraSequence(int frames) {
     List<CameraSequence.Pose> poses = List.of(new CameraSequence.Pose(640, 360, 1.0, 0),
         new CameraSequence.Pose(600, 340, 1.15, 4), new CameraSequence.Pose(700, 390, 1.3, -3),
         new CameraSequence.Pose(650, 360, 1.1, 1));
