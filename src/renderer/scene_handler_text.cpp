@@ -21,6 +21,11 @@ Vexel::Color ToKitColor(const Color& colour) {
                                  colour.channel[3]);
 }
 
+// What SetTextObjectScale fits to the rectangle and PlaceText centres on it.
+Vexel::Rect FittedBoxOf(const Vexel::Text& text) {
+  return text_fit::FittedBox(text.getBoundingBox(), text.getLineInkBox(), text.getInkBounds());
+}
+
 Vexel::Vector3 ToVector3(const double* values) {
   return {static_cast<float>(values[0]), static_cast<float>(values[1]),
           static_cast<float>(values[2])};
@@ -122,21 +127,23 @@ void SceneHandler::PlacePatch(InpaintedRectObject& patch, const PositionScaleAng
 void SceneHandler::PlaceText(Vexel::Text& text, const PositionScaleAngle& placement) {
   SetTextObjectScale(text, Vexel::Vector2(placement.scale_x, placement.scale_y),
                      Vexel::Degrees(placement.angle));
+  // Centred by its fitted ink box, so the baseline lands where the
+  // original's stood (see text_fitting.h).
   const Vexel::Vector2 offset =
-      text_fit::CentreOffset(text.getBoundingBox(), text.getScale().x, placement.angle);
+      text_fit::CentreOffset(FittedBoxOf(text), text.getScale().x, placement.angle);
   text.setPosition(placement.x - offset.x, placement.y - offset.y, -kOverlayDepth);
 }
 
 void SceneHandler::SetTextObjectScale(Vexel::Text& text, const Vexel::Vector2& size,
                                       const Vexel::Degrees& angle) {
-  Vexel::Rect bounds = text.getBoundingBox();
+  Vexel::Rect bounds = FittedBoxOf(text);
   const unsigned int gaps = text_fit::CountCharacterGaps(text.getText());
   const float spacing = text.getExtraSpaceBetweenChars();
   const float natural_width = bounds.width() - spacing * static_cast<float>(gaps);
   const float wanted = text_fit::ChooseExtraSpacing(natural_width, bounds.height(), gaps, size);
   if (std::fabs(wanted - spacing) > text_fit::kSpacingTolerance) {
     text.setExtraSpaceBetweenChars(wanted);
-    bounds = text.getBoundingBox();
+    bounds = FittedBoxOf(text);
   }
   // Scaled from the laid-out bounds, so whatever the spacing did the text
   // stays inside its rectangle.

@@ -15,6 +15,23 @@ unsigned int CountCharacterGaps(const std::string& utf8) {
   return code_points > 0 ? code_points - 1 : 0;
 }
 
+Vexel::Rect FittedBox(const Vexel::Rect& bounds, const Vexel::Rect& line_ink,
+                      const Vexel::Rect& ink) {
+  // Only the heights of the ink boxes count: a line ink box of spaces alone
+  // has no width but a height.
+  const bool has_line_ink = line_ink.top > line_ink.bottom;
+  const bool has_ink = !ink.isEmpty();
+  if (bounds.isEmpty() || (!has_line_ink && !has_ink))
+    return bounds;
+  float top = has_line_ink ? line_ink.top : ink.top;
+  float bottom = has_line_ink ? line_ink.bottom : ink.bottom;
+  if (has_ink) {
+    top = std::max(top, ink.top);
+    bottom = std::min(bottom, ink.bottom);
+  }
+  return {bounds.left, top, bounds.right, bottom};
+}
+
 float ChooseExtraSpacing(float natural_width, float height, unsigned int gaps,
                          const Vexel::Vector2& box) {
   if (gaps == 0 || !(natural_width > 0.0f) || !(height > 0.0f) || !(box.x > 0.0f) ||

@@ -124,12 +124,27 @@ TEST_F(SceneObjectsTest, ATextFitsItsRectangleCentredOnIt) {
   const float scale = text.getScale().x;
   EXPECT_EQ(text.getScale().y, scale);
   EXPECT_LE(text.getBoundingBox().width() * scale, 300.0f * text_fit::kWidthFill + 1e-3f);
-  EXPECT_NEAR(1.2f * scale, 30.0f * text_fit::kHeightFill, 1e-3f);  // the height decides
-  // The bounds' centre (0, -0.6 em) turned by 30 degrees lands on the
-  // rectangle's centre.
+  // The line ink box (0.9 em, which holds the glyphs' ink), not the line
+  // box, fills the height, and its centre (0, -0.65 em) turned by 30 degrees
+  // lands on the rectangle's centre.
+  EXPECT_NEAR(0.9f * scale, 30.0f * text_fit::kHeightFill, 1e-3f);
   const float radians = 30.0f * 3.14159265f / 180.0f;
-  EXPECT_NEAR(text.getPosition().x + 0.6f * scale * std::sin(radians), 100.0f, 1e-3f);
-  EXPECT_NEAR(text.getPosition().y - 0.6f * scale * std::cos(radians), -40.0f, 1e-3f);
+  EXPECT_NEAR(text.getPosition().x + 0.65f * scale * std::sin(radians), 100.0f, 1e-3f);
+  EXPECT_NEAR(text.getPosition().y - 0.65f * scale * std::cos(radians), -40.0f, 1e-3f);
+}
+
+TEST(TextFitting, TheFittedBoxIsTheLineInkBoxGrownToHoldTheGlyphsInk) {
+  const Vexel::Rect bounds(-2.0f, 0.0f, 2.0f, -1.2f);
+  // An accent above the capitals: the box grows upwards, keeping the
+  // room for descenders.
+  EXPECT_EQ(text_fit::FittedBox(bounds, {-2.0f, -0.2f, 2.0f, -1.0f}, {-1.9f, -0.1f, 1.9f, -0.8f}),
+            Vexel::Rect(-2.0f, -0.1f, 2.0f, -1.0f));
+  // Spaces alone: the line ink box has no width, its height still counts.
+  EXPECT_EQ(text_fit::FittedBox(bounds, {0.0f, -0.2f, 0.0f, -1.0f}, {}),
+            Vexel::Rect(-2.0f, -0.2f, 2.0f, -1.0f));
+  EXPECT_EQ(text_fit::FittedBox(bounds, {}, {-1.0f, -0.3f, 1.0f, -0.9f}),
+            Vexel::Rect(-2.0f, -0.3f, 2.0f, -0.9f));
+  EXPECT_EQ(text_fit::FittedBox(bounds, {}, {}), bounds);
 }
 
 TEST_F(SceneObjectsTest, IdenticalTextsAreReusedAndTheirPatchesUploadedOnlyOnANewId) {

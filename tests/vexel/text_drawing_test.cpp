@@ -110,6 +110,43 @@ TEST_F(TextDrawing, CjkTextFromAPlatformCollectionDrawsAndItsReferenceCharacterS
   ExpectInkWithin(ink, *text, box);
 }
 
+TEST_F(TextDrawing, TheLineInkBoxDependsOnTheKindOfTextNotOnItsLetters) {
+  Font font("NotoSans-Regular.ttf", Font::FILE_TYPE_SYSTEM, true);
+  auto text = MakeText(font, "Salida", 40, -90, 20);
+  const Vexel::Rect salida = text->getLineInkBox();
+  text->setText("Mantener");
+  EXPECT_EQ(text->getLineInkBox().top, salida.top);
+  EXPECT_EQ(text->getLineInkBox().bottom, salida.bottom);
+
+  // "Keep": its descender lies on the box's bottom edge.
+  text->setText("Keep");
+  EXPECT_NEAR(text->getInkBounds().bottom, text->getLineInkBox().bottom, 0.01f);
+
+  // Capitals and digits: from the capitals' top to the baseline.
+  text->setText("EXIT 42");
+  const Vexel::Rect exit = text->getInkBounds();
+  const float one_line = text->getLineInkBox().height();
+  EXPECT_NEAR(text->getLineInkBox().bottom, exit.bottom, 0.01f);
+  EXPECT_NEAR(text->getLineInkBox().top, exit.top, 0.01f);
+
+  // Two lines: from the first line's top to the last line's bottom.
+  text->setText("EXIT\nEXIT");
+  EXPECT_NEAR(text->getLineInkBox().top, exit.top, 0.01f);
+  EXPECT_NEAR(text->getLineInkBox().height(), one_line + text->getBoundingBox().height() / 2,
+              1e-4f);
+
+  // A CJK line: the ideographs' ink.
+  Font cjk("NotoSansCJK-Regular.ttc", Font::FILE_TYPE_SYSTEM, true);
+  cjk.setReferenceCharacter(0xFF41);
+  text->setFont(cjk);
+  text->setText("国");
+  EXPECT_EQ(text->getLineInkBox().top, text->getInkBounds().top);
+  EXPECT_EQ(text->getLineInkBox().bottom, text->getInkBounds().bottom);
+  text->setText("");
+  EXPECT_TRUE(text->getLineInkBox().isEmpty());
+  EXPECT_TRUE(text->getInkBounds().isEmpty());
+}
+
 TEST_F(TextDrawing, ArabicTextDrawsRightToLeftStartingAtTheRight) {
   Font font("NotoSansArabic-Regular.ttf", Font::FILE_TYPE_SYSTEM, true);
   // Right-aligned at x = 60: a right-to-left paragraph puts its first word

@@ -5,10 +5,12 @@
 #include FT_FREETYPE_H
 #include FT_TRUETYPE_TABLES_H
 
+#include <algorithm>
 #include <fstream>
 #include <iterator>
 #include <map>
 #include <mutex>
+#include <string_view>
 
 #include "distance_field.h"
 #include "platform/kit_files.h"
@@ -148,6 +150,44 @@ FontFace::FontFace(std::vector<std::uint8_t> data, const std::string& descriptio
   hb_font_ = hb_font_create(hb_face_);
   // Positions in font units; the layout divides by units per em.
   hb_font_set_scale(hb_font_, static_cast<int>(units_per_em_), static_cast<int>(units_per_em_));
+  design_ink_ = MeasureDesignInk();
+}
+
+DesignInk FontFace::MeasureDesignInk() const {
+  // Extremes of the ink of those characters the font maps and inks.
+  auto measure = [this](std::u32string_view characters, bool top, float& value) {
+    bool found = false;
+    for (const char32_t c : characters) {
+      hb_codepoint_t glyph = 0;
+      if (!hb_font_get_nominal_glyph(hb_font_, c, &glyph) || glyph == 0)
+        continue;
+      const GlyphInk ink = Ink(glyph);
+      if (ink.empty)
+        continue;
+      const float edge = top ? ink.top : ink.bottom;
+      value = !found ? edge : top ? std::max(value, edge) : std::min(value, edge);
+      found = true;
+    }
+    return found;
+  };
+  DesignInk ink;
+  // Without the Latin references (a font of another script), the OS/2 cap
+  // height, else the line's ascender and descender, stand in.
+  if (!measure(U"H", true, ink.capital)) {
+    const auto* os2 = static_cast<const TT_OS2*>(FT_Get_Sfnt_Table(ft_face_, FT_SFNT_OS2));
+    ink.capital = os2 != nullptr && os2->version >= 2 && os2->sCapHeight > 0
+                      ? static_cast<float>(os2->sCapHeight) / units_per_em_
+                      : DefaultLineMetrics().ascent;
+  }
+  ink.ascender = ink.capital;
+  float ascender = 0.0f;
+  if (measure(U"bdfhkl", true, ascender))
+    ink.ascender = std::max(ink.ascender, ascender);
+  if (!measure(U"gjpqy", false, ink.descender))
+    ink.descender = -DefaultLineMetrics().descent;
+  ink.has_ideograph = measure(U"\u56FD", true, ink.ideograph_top) &&
+                      measure(U"\u56FD", false, ink.ideograph_bottom);
+  return ink;
 }
 
 FontFace::~FontFace() {

@@ -31,6 +31,17 @@ struct GlyphInk {
   float left = 0, top = 0, right = 0, bottom = 0;
 };
 
+// Where a line's ink lies by the font's design, in ems above the baseline
+// (negative below), measured on the ink of reference glyphs.
+struct DesignInk {
+  float capital = 0.0f;    // top of "H"
+  float ascender = 0.0f;   // highest of the capital and "b d f h k l"
+  float descender = 0.0f;  // lowest of "g j p q y"
+  bool has_ideograph = false;
+  float ideograph_top = 0.0f;  // of U+56FD, a full-height ideograph
+  float ideograph_bottom = 0.0f;
+};
+
 // A glyph ready to draw: its distance field's box relative to the glyph
 // origin (ems, y upwards) and where the field lies in the atlas.
 struct GlyphImage {
@@ -68,6 +79,8 @@ class FontFace {
   // the default metrics when the font does not map it.
   LineMetrics ReferenceLineMetrics(char32_t reference) const;
 
+  const DesignInk& design_ink() const { return design_ink_; }
+
   GlyphInk Ink(std::uint32_t glyph) const;
   // The glyph's distance field, rasterised on first use.
   const GlyphImage& Image(std::uint32_t glyph);
@@ -75,6 +88,7 @@ class FontFace {
 
  private:
   FontFace(std::vector<std::uint8_t> data, const std::string& description);
+  DesignInk MeasureDesignInk() const;
 
   std::shared_ptr<FreeTypeLibrary> library_;
   std::vector<std::uint8_t> data_;
@@ -83,6 +97,7 @@ class FontFace {
   hb_face_t* hb_face_ = nullptr;
   hb_font_t* hb_font_ = nullptr;
   float units_per_em_ = 1000.0f;
+  DesignInk design_ink_;
   GlyphAtlas atlas_;
   std::unordered_map<std::uint32_t, GlyphImage> images_;
 };

@@ -55,6 +55,7 @@ class TextImpl : public Node::Impl {
   bool layout_dirty = true;
   std::uint32_t laid_out_reference = 0;
   internal::TextLayout layout;
+  Rect line_ink;
 
   // Glyph quads grouped by atlas page: x, y, u, v per vertex.
   struct Batch {
@@ -78,6 +79,7 @@ void TextImpl::EnsureLayout() {
   layout_dirty = false;
   laid_out_reference = reference;
   layout = internal::TextLayout();
+  line_ink = Rect();
   vertices.clear();
   indices.clear();
   batches.clear();
@@ -90,7 +92,20 @@ void TextImpl::EnsureLayout() {
   params.alignment = alignment;
   params.extra_spacing = extra_spacing;
   params.line = face.ReferenceLineMetrics(reference);
-  layout = internal::LayOutText(internal::DecodeUtf8(text), face, params);
+  const std::u32string characters = internal::DecodeUtf8(text);
+  layout = internal::LayOutText(characters, face, params);
+  if (layout.line_count > 0) {
+    const internal::DesignInk& design = face.design_ink();
+    const bool ideographic = reference != 0 && face.HasCharacter(reference) && design.has_ideograph;
+    const bool descends =
+        std::any_of(characters.begin(), characters.end(), internal::IsSmallOrCaselessLetter);
+    const float top = ideographic ? design.ideograph_top
+                      : descends  ? design.ascender
+                                  : design.capital;
+    const float bottom = ideographic ? design.ideograph_bottom : descends ? design.descender : 0.0f;
+    line_ink = Rect(layout.bounds.left, layout.first_baseline + top, layout.bounds.right,
+                    layout.last_baseline + bottom);
+  }
 
   struct Quad {
     int page;
@@ -265,6 +280,18 @@ Rect Text::getBoundingBox() const {
   TextImpl& t = Of(*this);
   t.EnsureLayout();
   return t.layout.bounds;
+}
+
+Rect Text::getInkBounds() const {
+  TextImpl& t = Of(*this);
+  t.EnsureLayout();
+  return t.layout.ink;
+}
+
+Rect Text::getLineInkBox() const {
+  TextImpl& t = Of(*this);
+  t.EnsureLayout();
+  return t.line_ink;
 }
 
 std::size_t Text::getLineCount() const {

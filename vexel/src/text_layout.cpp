@@ -258,6 +258,8 @@ TextLayout LayOutText(const std::u32string& text, const FontFace& face,
   const bool wraps = box.width() > 0.0f;
   float line_top = box.top;
   bool bounds_empty = true;
+  bool ink_empty = true;
+  layout.first_baseline = box.top - params.line.ascent;
 
   auto place_line = [&](const LineGlyphs& line) {
     float x = box.left;
@@ -266,6 +268,7 @@ TextLayout LayOutText(const std::u32string& text, const FontFace& face,
     else if (params.alignment == Text::ALIGN_RIGHT)
       x = (wraps ? box.right : box.left) - line.width;
     const float baseline = line_top - params.line.ascent;
+    layout.last_baseline = baseline;
     Include(layout.bounds, bounds_empty, x, line_top, x + line.width,
             line_top - params.line.height());
     for (const ShapedGlyph& glyph : line.glyphs) {
@@ -273,6 +276,8 @@ TextLayout LayOutText(const std::u32string& text, const FontFace& face,
       const GlyphInk ink = face.Ink(glyph.glyph);
       if (!ink.empty) {
         Include(layout.bounds, bounds_empty, placed.x + ink.left, placed.y + ink.top,
+                placed.x + ink.right, placed.y + ink.bottom);
+        Include(layout.ink, ink_empty, placed.x + ink.left, placed.y + ink.top,
                 placed.x + ink.right, placed.y + ink.bottom);
       }
       layout.glyphs.push_back(placed);

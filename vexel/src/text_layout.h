@@ -29,6 +29,9 @@ struct TextLayout {
   std::vector<PlacedGlyph> glyphs;  // in drawing order, line after line
   std::size_t line_count = 0;
   Rect bounds;  // line boxes and glyph ink, text units
+  Rect ink;     // glyph ink alone; empty when no glyph has ink
+  float first_baseline = 0.0f;
+  float last_baseline = 0.0f;
 };
 
 // Paragraphs split at line breaks; each is ordered by the bidirectional

@@ -129,6 +129,11 @@ bool IsWhiteSpace(char32_t c) {
   return u_isUWhiteSpace(static_cast<UChar32>(c)) != 0;
 }
 
+bool IsSmallOrCaselessLetter(char32_t c) {
+  const auto u = static_cast<UChar32>(c);
+  return u_isalpha(u) != 0 && u_isupper(u) == 0 && u_istitle(u) == 0;
+}
+
 bool IsLineBreak(char32_t c) {
   return c == U'\n' || c == U'\r' || c == 0x2028 || c == 0x2029 || c == 0x0B || c == 0x0C ||
          c == 0x85;

@@ -15,6 +15,9 @@ std::string EncodeUtf8(const std::u32string& text);
 std::u32string NormalizeForDisplay(const std::u32string& text);
 
 bool IsWhiteSpace(char32_t c);
+// A letter other than a capital: lowercase, or of a script without case.
+// Such letters may reach below the baseline; capitals do not.
+bool IsSmallOrCaselessLetter(char32_t c);
 bool IsLineBreak(char32_t c);
 
 }  // namespace Vexel::internal

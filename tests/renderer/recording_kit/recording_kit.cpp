@@ -390,5 +390,13 @@ Rect Text::getBoundingBox() const {
   const float width = 0.5f * n + NodeOf(*this).extra_spacing * (n - 1.0f);
   return Rect(-width / 2.0f, 0.0f, width / 2.0f, -1.2f);
 }
+Rect Text::getInkBounds() const {
+  const Rect box = getBoundingBox();
+  return box.isEmpty() ? box : Rect(box.left, -0.3f, box.right, -0.9f);
+}
+Rect Text::getLineInkBox() const {
+  const Rect box = getBoundingBox();
+  return box.isEmpty() ? box : Rect(box.left, -0.2f, box.right, -1.1f);
+}
 
 }  // namespace Vexel

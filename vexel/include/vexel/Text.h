@@ -67,6 +67,21 @@ class Text : public Node {
   // The smallest rectangle, in text units, holding every line's box and
   // every glyph's ink. Empty (all zero) for an empty text or without a font.
   Rect getBoundingBox() const;
+  // The smallest rectangle, in text units, holding every glyph's ink alone.
+  // Empty when no glyph has ink.
+  Rect getInkBounds() const;
+  // Where the ink of the text's lines lies by the font's design, in text
+  // units, across the bounding box's width: from the first line's top to
+  // the last line's bottom. A text holding a letter other than a capital
+  // (lowercase, or of a script without case) reaches from the top of
+  // ascenders and capitals (the font's "H b d f h k l") to the bottom of
+  // descenders ("g j p q y"); one of capitals, digits and punctuation from
+  // the top of the capitals ("H") to the baseline. With a reference character
+  // that the font maps (a CJK line) and an ideograph in the font: from the top
+  // to the bottom of the ideograph U+56FD instead. Unlike getInkBounds, the
+  // same for every text of the same kind: "Salida" and "Mantener" get the
+  // same box. Empty (all zero) for an empty text or without a font.
+  Rect getLineInkBox() const;
   std::size_t getLineCount() const;
 };
 

@@ -14,12 +14,14 @@ import org.junit.jupiter.api.Order;
 import org.junit.jupiter.api.Test;
 import org.junit.jupiter.api.TestMethodOrder;
 import org.junit.jupiter.params.ParameterizedTest;
+import org.junit.jupiter.params.provider.CsvSource;
 import org.junit.jupiter.params.provider.ValueSource;
 import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.MatOfPoint;
 import org.opencv.core.Point;
+import org.opencv.core.Rect;
 import org.opencv.core.RotatedRect;
 import org.opencv.core.Scalar;
 import org.opencv.core.Size;
@@ -112,15 +114,51 @@ class VexelJNITest {
     }
   }
 
-  @Test
-  void chineseTextIsDrawnWithItsDefaultFont() {
-    try (Scene scene = new Scene(320, 240, 320, 180)) {
-      VexelJNI.setTranslationLanguage("zh-CHS");
-      RotatedRect rect = new RotatedRect(new Point(160, 90), new Size(120, 40), 0);
+  /** CJK text fills the height of its rectangle with its ideographs, and stays inside it. */
+  @ParameterizedTest
+  @CsvSource({"zh-CHS, 安全出口", "ja, 非常口"})
+  void cjkTextIsDrawnWithItsDefaultFontAcrossItsRectangle(String language, String text) {
+    try (Scene scene = new Scene(320, 180, 320, 180)) {
+      VexelJNI.setTranslationLanguage(language);
+      RotatedRect rect = new RotatedRect(new Point(160, 90), new Size(160, 40), 0);
       NativeLog log = new NativeLog();
-      renderText(imageWithMarker(320, 180, rect), "安全出口", rect);
-      int red = count(red(scene.pixels()));
-      assertTrue(red > 150, "CJK glyphs drawn: " + red);
+      renderText(imageWithMarker(320, 180, rect), text, rect);
+      Rect ink = Imgproc.boundingRect(red(scene.pixels()));
+      assertTrue(ink.y >= 69 && ink.y + ink.height <= 111, "inside rows 70..109: " + ink);
+      assertTrue(ink.height >= 34, "ideographs fill the height: " + ink);
+      assertEquals(List.of(), log.messages('E'));
+    }
+  }
+
+  /**
+   * A Latin translation shows capitals as tall as the original's. Each original is drawn first,
+   * the engine serving as printer: its ink rows are the OCR line box the translation then gets,
+   * its first letter's height its capital height.
+   */
+  @ParameterizedTest
+  @CsvSource({"EXIT, SALIDA", // capitals only: no room kept for descenders
+      "Keep the door closed, Mantenga la puerta cerrada",
+      "Keep, Guardar", // the original's descender, none in the translation
+      "No parking, Prohibido aparcar"})
+  void
+  aLatinTranslationTakesTheCapitalHeightOfTheOriginal(String original, String translation) {
+    try (Scene scene = new Scene(960, 160, 960, 160)) {
+      // The font a desktop host binds for Latin-script languages.
+      VexelJNI.setTranslationLanguageFont("es", "/system/fonts/NotoSans-Regular.ttf");
+      VexelJNI.setTranslationLanguage("es");
+      NativeLog log = new NativeLog();
+      Mat image = new Mat(160, 960, CvType.CV_8UC4, BACKGROUND);
+      renderText(image, original, new RotatedRect(new Point(480, 80), new Size(400, 40), 0));
+      int[] printed = inkRows(scene.pixels());
+      int lineBox = printed[1] - printed[0];
+      renderText(image, translation,
+          new RotatedRect(
+              new Point(480, (printed[0] + printed[1]) / 2.0), new Size(940, lineBox), 0));
+      int[] drawn = inkRows(scene.pixels());
+      double ratio = (double) drawn[2] / printed[2];
+      assertTrue(Math.abs(ratio - 1) <= 0.15,
+          "capital height " + drawn[2] + " px, original " + printed[2] + " px");
+      assertTrue(drawn[0] >= printed[0] - 1 && drawn[1] <= printed[1] + 1, "inside the line box");
       assertEquals(List.of(), log.messages('E'));
     }
   }
@@ -242,6 +280,26 @@ class VexelJNITest {
 
   private static Mat red(Mat frame) {
     return inRange(frame, new Scalar(181, 0, 0, 0), new Scalar(255, 79, 79, 255));
+  }
+
+  /** Rows of the red ink: first, last + 1, and the height of its leftmost letter. */
+  private static int[] inkRows(Mat frame) {
+    Mat mask = red(frame);
+    Rect all = Imgproc.boundingRect(mask);
+    Mat labels = new Mat();
+    Mat stats = new Mat();
+    int components = Imgproc.connectedComponentsWithStats(mask, labels, stats, new Mat());
+    int first = -1;
+    for (int i = 1; i < components; ++i) {
+      if (stats.get(i, Imgproc.CC_STAT_AREA)[0] >= 10
+          && (first < 0
+              || stats.get(i, Imgproc.CC_STAT_LEFT)[0]
+                  < stats.get(first, Imgproc.CC_STAT_LEFT)[0])) {
+        first = i;
+      }
+    }
+    assertTrue(first > 0, "no ink");
+    return new int[] {all.y, all.y + all.height, (int) stats.get(first, Imgproc.CC_STAT_HEIGHT)[0]};
   }
 
   private static int count(Mat mask) {
