@@ -8,6 +8,7 @@ import com.quenda.tessel.desktop.engine.FontChoice;
 import com.quenda.tessel.desktop.engine.OverlayDrawer;
 import com.quenda.tessel.desktop.engine.Overlays;
 import com.quenda.tessel.desktop.engine.Rects;
+import com.quenda.tessel.desktop.engine.TextPlacement;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.translate.Translator;
@@ -47,9 +48,11 @@ public final class PhotoJob {
 
     // Lines that failed to translate stay as they are: neither erased nor drawn over.
     List<RecognizedLine> shown = new ArrayList<>();
+    List<String> shownTranslations = new ArrayList<>();
     for (int i = 0; i < lines.size(); i++) {
       if (translations.get(i) != null) {
         shown.add(lines.get(i));
+        shownTranslations.add(translations.get(i));
       }
     }
     progress.step(input.name + ": erasing " + shown.size() + " lines");
@@ -59,7 +62,7 @@ public final class PhotoJob {
     progress.step(input.name + ": drawing");
     Mat drawn;
     try {
-      drawn = shown.isEmpty() ? rgb.clone() : draw(rgb, shown, translations, lines, patches);
+      drawn = shown.isEmpty() ? rgb.clone() : draw(rgb, shown, shownTranslations, patches);
     } finally {
       patches.release();
     }
@@ -76,22 +79,19 @@ public final class PhotoJob {
   }
 
   private Mat draw(Mat rgb, List<RecognizedLine> shown, List<String> translations,
-      List<RecognizedLine> lines, Eraser.Patches patches) throws HostException {
+      Eraser.Patches patches) throws HostException {
     int n = shown.size();
-    String[] texts = new String[n];
     long[] ids = new long[n];
-    for (int i = 0, k = 0; i < lines.size(); i++) {
-      if (translations.get(i) != null) {
-        texts[k] = translations.get(i);
-        ids[k] = k;
-        ++k;
-      }
+    List<RotatedRect> textRects = new ArrayList<>();
+    for (int i = 0; i < n; i++) {
+      ids[i] = i;
+      textRects.add(
+          TextPlacement.textRect(shown.get(i).rect, shown.get(i).text, translations.get(i)));
     }
-    List<RotatedRect> rects = rects(shown);
-    Overlays overlays = new Overlays(texts, patches.patchRects, Rects.pack(rects), ids,
-        patches.addresses(), patches.colors, null);
+    Overlays overlays = new Overlays(translations.toArray(new String[0]), patches.patchRects,
+        Rects.pack(textRects), ids, patches.addresses(), patches.colors, null);
     try (OverlayDrawer drawer = new OverlayDrawer(rgb.cols(), rgb.rows())) {
-      drawer.setLanguage(target, FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects)));
+      drawer.setLanguage(target, FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects(shown))));
       return drawer.draw(rgb, overlays);
     }
   }

@@ -10,6 +10,7 @@ import com.quenda.tessel.desktop.engine.FrameMeans;
 import com.quenda.tessel.desktop.engine.OverlayDrawer;
 import com.quenda.tessel.desktop.engine.Overlays;
 import com.quenda.tessel.desktop.engine.Rects;
+import com.quenda.tessel.desktop.engine.TextPlacement;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.photo.LineResult;
@@ -429,14 +430,14 @@ public final class VideoJob {
       long[] ids = new long[n];
       long[] patches = new long[n];
       int[] colors = new int[n];
-      List<RotatedRect> rects = new ArrayList<>();
+      List<RotatedRect> textRects = new ArrayList<>();
       for (int i = 0; i < n; i++) {
         ShownLine line = visible.get(i);
         texts[i] = line.translation;
         ids[i] = line.id;
         patches[i] = line.patch.getNativeObjAddr();
         colors[i] = line.color;
-        rects.add(line.rect);
+        textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));
       }
       double[] patchRects = patchRects(visible);
       double[] gains = new double[3 * n];
@@ -446,8 +447,8 @@ public final class VideoJob {
             Arrays.copyOfRange(means, 3 * i, 3 * i + 3), visible.get(i).referenceMeans);
         System.arraycopy(lineGains, 0, gains, 3 * i, 3);
       }
-      Mat drawn = drawer(frame).draw(
-          frame, new Overlays(texts, patchRects, Rects.pack(rects), ids, patches, colors, gains));
+      Mat drawn = drawer(frame).draw(frame,
+          new Overlays(texts, patchRects, Rects.pack(textRects), ids, patches, colors, gains));
       timings.add("draw", (System.nanoTime() - start) / 1e6);
       return drawn;
     }
