@@ -5,6 +5,7 @@ import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
 import com.quenda.tessel.desktop.Progress;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
+import com.quenda.tessel.desktop.photo.LineResult;
 import com.quenda.tessel.desktop.photo.PhotoInput;
 import com.quenda.tessel.desktop.photo.PhotoJob;
 import com.quenda.tessel.desktop.photo.PhotoResult;
@@ -21,7 +22,10 @@ import java.io.PrintStream;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
+import java.util.ArrayList;
 import java.util.Arrays;
+import java.util.Collections;
+import java.util.List;
 import org.opencv.core.Core;
 import org.opencv.core.Mat;
 import org.opencv.imgcodecs.Imgcodecs;
@@ -51,6 +55,7 @@ public final class HostBench {
     Translator translator = Translators.create(en, es, null);
 
     photo(dir, reader, translator, es, runs);
+    capitals(dir, reader, translator, es);
     // Ten seconds, so that live most frames come after the first keyframe's result.
     BundledInputs.writeVideo(BundledInputs.cameraSequence(300), dir.resolve("camera.mp4").toFile());
     for (boolean live : new boolean[] {false, true}) {
@@ -60,11 +65,7 @@ public final class HostBench {
 
   private static void photo(
       Path dir, PhotoReader reader, Translator translator, Language to, int runs) throws Exception {
-    Scene page = Scenes.bundled("page");
-    Path input = dir.resolve("page.png");
-    Mat bgr = new Mat();
-    Imgproc.cvtColor(page.rgb, bgr, Imgproc.COLOR_RGB2BGR);
-    Imgcodecs.imwrite(input.toString(), bgr);
+    Path input = write(Scenes.bundled("page"), dir);
     PhotoJob job = new PhotoJob(reader, translator, to);
     String[] stages = {"ocr", "translate", "erase", "draw", "total"};
     double[][] millis = new double[stages.length][runs];
@@ -83,6 +84,50 @@ public final class HostBench {
       System.err.printf(" %s %.0f", stages[s], median(millis[s]));
     }
     System.err.println();
+  }
+
+  /** Drawn capital height over the original's, per translated line of the sign scenes. */
+  private static void capitals(Path dir, PhotoReader reader, Translator translator, Language to)
+      throws Exception {
+    PhotoJob job = new PhotoJob(reader, translator, to);
+    List<Double> ratios = new ArrayList<>();
+    // Lines whose translation is not much longer than the original are not narrowed to fit the
+    // width: those show the height fitting alone.
+    List<Double> notLonger = new ArrayList<>();
+    for (String name : List.of("street", "station", "shop", "page")) {
+      Path input = write(Scenes.bundled(name), dir);
+      PhotoResult result = job.run(PhotoInput.check(input), new Progress(1, true, System.err));
+      for (LineResult line : result.lines) {
+        if (!line.translated()) {
+          continue;
+        }
+        double before = CapHeight.of(result.original, line.line.rect, line.color);
+        double after = CapHeight.of(result.translated, line.line.rect, line.color);
+        if (before > 0 && after > 0) {
+          ratios.add(after / before);
+          if (line.translation.length() <= 1.1 * line.line.text.length()) {
+            notLonger.add(after / before);
+          }
+        }
+      }
+      result.release();
+    }
+    Collections.sort(ratios);
+    long within = ratios.stream().filter(r -> Math.abs(r - 1) <= 0.15).count();
+    System.err.printf("capital height drawn/original over %d lines: median %.2f, range %.2f-%.2f, "
+            + "%d within 15%% (the rest narrowed to fit the width)%n",
+        ratios.size(), ratios.get(ratios.size() / 2), ratios.get(0), ratios.get(ratios.size() - 1),
+        within);
+  }
+
+  private static Path write(Scene scene, Path dir) {
+    Path file = dir.resolve(scene.name + ".png");
+    Mat bgr = new Mat();
+    Imgproc.cvtColor(scene.rgb, bgr, Imgproc.COLOR_RGB2BGR);
+    Imgcodecs.imwrite(file.toString(), bgr);
+    bgr.release();
+    scene.release();
+    return file;
   }
 
   private static void video(Path dir, boolean live) throws HostException {
