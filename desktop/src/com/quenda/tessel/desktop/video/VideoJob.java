@@ -100,6 +100,8 @@ public final class VideoJob {
     private long nextId;
     private int lastKeyframe = Integer.MIN_VALUE;
     private boolean fontChosen;
+    private List<Object> gainsKey;
+    private double[] gainsValue;
 
     // Live: the keyframe being worked on, the reason it was taken, and the frames since.
     private Future<CaughtUp> pending;
@@ -379,17 +381,42 @@ public final class VideoJob {
 
     private List<ShownLine> linesNeedingErasing(Mat frame) {
       List<ShownLine> visible = visible();
-      double[] means = FrameMeans.under(frame, patchRects(visible));
+      double[] gains = gains(frame, visible);
       List<ShownLine> stale = new ArrayList<>();
       for (int i = 0; i < visible.size(); i++) {
         ShownLine line = visible.get(i);
-        double[] gains =
-            FrameMeans.gains(Arrays.copyOfRange(means, 3 * i, 3 * i + 3), line.referenceMeans);
-        if (KeyframeRules.needsErasing(line.erasedAt, line.rect, gains)) {
+        if (KeyframeRules.needsErasing(
+                line.erasedAt, line.rect, Arrays.copyOfRange(gains, 3 * i, 3 * i + 3))) {
           stale.add(line);
         }
       }
       return stale;
+    }
+
+    /**
+     * Per visible line, three gains from the light its patch was cut in to the light under it in
+     * {@code frame}. Asked for twice a frame (the erasing rule, then drawing): the second time,
+     * with the same lines at the same places, the first answer is kept.
+     */
+    private double[] gains(Mat frame, List<ShownLine> visible) {
+      List<Object> key = new ArrayList<>();
+      key.add(frame);
+      for (ShownLine line : visible) {
+        key.add(line);
+        key.add(line.rect);
+        key.add(line.referenceMeans);
+      }
+      if (!key.equals(gainsKey)) {
+        double[] means = FrameMeans.under(frame, patchRects(visible));
+        gainsValue = new double[means.length];
+        for (int i = 0; i < visible.size(); i++) {
+          System.arraycopy(FrameMeans.gains(Arrays.copyOfRange(means, 3 * i, 3 * i + 3),
+                               visible.get(i).referenceMeans),
+              0, gainsValue, 3 * i, 3);
+        }
+        gainsKey = key;
+      }
+      return gainsValue;
     }
 
     /** Step 3 (offline): cuts new patches from this frame where the old ones no longer match. */
@@ -439,16 +466,9 @@ public final class VideoJob {
         colors[i] = line.color;
         textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));
       }
-      double[] patchRects = patchRects(visible);
-      double[] gains = new double[3 * n];
-      double[] means = FrameMeans.under(frame, patchRects);
-      for (int i = 0; i < n; i++) {
-        double[] lineGains = FrameMeans.gains(
-            Arrays.copyOfRange(means, 3 * i, 3 * i + 3), visible.get(i).referenceMeans);
-        System.arraycopy(lineGains, 0, gains, 3 * i, 3);
-      }
       Mat drawn = drawer(frame).draw(frame,
-          new Overlays(texts, patchRects, Rects.pack(textRects), ids, patches, colors, gains));
+          new Overlays(texts, patchRects(visible), Rects.pack(textRects), ids, patches, colors,
+              gains(frame, visible)));
       timings.add("draw", (System.nanoTime() - start) / 1e6);
       return drawn;
     }

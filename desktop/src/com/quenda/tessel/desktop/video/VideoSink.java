@@ -7,6 +7,7 @@ import java.awt.image.BufferedImage;
 import java.awt.image.DataBufferByte;
 import java.io.IOException;
 import java.nio.file.Path;
+import java.util.ArrayList;
 import java.util.List;
 import org.opencv.core.Mat;
 import org.opencv.core.Size;
@@ -36,7 +37,9 @@ final class VideoSink implements AutoCloseable {
   private final List<Codec> codecs;
   private VideoWriter writer;
   private Codec codec;
-  private AnimatedGif preview;
+  // Kept small and written when the video is complete: GIF encoding is slow, and the frame loop
+  // must not wait for it.
+  private final List<BufferedImage> preview = new ArrayList<>();
   private int frames;
 
   VideoSink(OutputFiles files, String name, double fps, boolean fastEncoding) {
@@ -70,15 +73,16 @@ final class VideoSink implements AutoCloseable {
     return codec == null ? null : codec.fourcc;
   }
 
-  /** Closes the streams; the caller then commits the output files. */
+  /** Closes the video and writes the preview; the caller then commits the output files. */
   void finish() throws HostException {
-    if (writer != null) {
-      writer.release();
+    if (writer == null) {
+      return;
     }
-    try {
-      if (preview != null) {
-        preview.close();
-        preview = null;
+    writer.release();
+    int delay = (int) Math.round(1000.0 * PREVIEW_STEP / fps);
+    try (AnimatedGif gif = new AnimatedGif(files.stage(name + ".preview.gif").toFile(), delay)) {
+      for (BufferedImage image : preview) {
+        gif.add(image);
       }
     } catch (IOException e) {
       throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
@@ -89,13 +93,6 @@ final class VideoSink implements AutoCloseable {
   public void close() {
     if (writer != null) {
       writer.release();
-    }
-    if (preview != null) {
-      try {
-        preview.close();
-      } catch (IOException e) {
-        // Staged only; the output files remove it.
-      }
     }
   }
 
@@ -117,15 +114,9 @@ final class VideoSink implements AutoCloseable {
       throw new HostException(ExitStatus.CANNOT_WRITE,
           "no video codec could write " + name + " (tried H.264, MPEG-4 and Motion JPEG)");
     }
-    int delay = (int) Math.round(1000.0 * PREVIEW_STEP / fps);
-    try {
-      preview = new AnimatedGif(files.stage(name + ".preview.gif").toFile(), delay);
-    } catch (IOException e) {
-      throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
-    }
   }
 
-  private void addPreview(Mat bgr) throws HostException {
+  private void addPreview(Mat bgr) {
     int height = (int) Math.round((double) bgr.rows() * PREVIEW_WIDTH / bgr.cols());
     Mat small = new Mat();
     Imgproc.resize(bgr, small, new Size(PREVIEW_WIDTH, height), 0, 0, Imgproc.INTER_AREA);
@@ -133,10 +124,6 @@ final class VideoSink implements AutoCloseable {
         new BufferedImage(small.cols(), small.rows(), BufferedImage.TYPE_3BYTE_BGR);
     small.get(0, 0, ((DataBufferByte) image.getRaster().getDataBuffer()).getData());
     small.release();
-    try {
-      preview.add(image);
-    } catch (IOException e) {
-      throw new HostException(ExitStatus.CANNOT_WRITE, "cannot write " + name + ".preview.gif");
-    }
+    preview.add(image);
   }
 }
