@@ -1,6 +1,13 @@
 // Bridge of com.quenda.tessel.inpainting.InpaintingJNI: validates and copies
 // the host's arrays; the request itself is answered by the inpainting
 // subsystem.
+//
+// InpaintingRotRectImg in step order: here the rectangles, colour array and
+// output addresses are checked and copied (each refusal logged and -1) and
+// the image writer is bound; AnswerInpaintingRequest
+// (inpainting/driver/inpainting_request.cpp) runs the pipeline, checks its
+// answer, assigns the overlays and packs the colours; back here the packed
+// colours are written into the host's array.
 #include <jni.h>
 
 #include <cstdint>
