@@ -31,7 +31,8 @@ using ocr::jni::OnRelease;
 // the pipeline refuses.
 const cv::Mat& InputImage(jlong address) {
   static const cv::Mat kEmpty;
-  return address != 0 ? ocr::jni::HostMat(address) : kEmpty;
+  const cv::Mat* image = ocr::jni::HostMatOrNull(address);
+  return image != nullptr ? *image : kEmpty;
 }
 
 size_t LengthOf(JNIEnv* env, jarray array) {

@@ -92,7 +92,7 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_renderOneFrame(
     JNIEnv* env, jclass, jlong imageMatAddr, jobjectArray texts, jdoubleArray patchRects,
     jdoubleArray textRects, jlongArray ids, jlongArray patchMatAddrs, jdoubleArray colorScales,
     jdoubleArray colorShifts, jintArray colors) {
-  const cv::Mat* image = imageMatAddr != 0 ? &ocr::jni::HostMat(imageMatAddr) : nullptr;
+  const cv::Mat* image = ocr::jni::HostMatOrNull(imageMatAddr);
   const std::size_t text_count =
       texts != nullptr ? static_cast<std::size_t>(env->GetArrayLength(texts)) : 0;
   // Pinned for the call and copied back on release, as the host expects of
