@@ -119,8 +119,8 @@ void Render(const HostFrame& frame, bool with_image) {
 }
 
 void Update(const HostFrame& frame, bool with_image) {
-  ocr_ar::bridge::UpdateFrame(with_image ? &frame.image() : nullptr, kTexts, frame.Reader(),
-                              frame.Arrays());
+  ocr_ar::bridge::RenderOneFrame(with_image ? &frame.image() : nullptr, kTexts, frame.Reader(),
+                                 frame.Arrays(), ocr_ar::bridge::FrameEnd::kSceneOnly);
 }
 
 // The whole call: update and draw.

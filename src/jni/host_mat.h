@@ -13,4 +13,9 @@ inline cv::Mat& HostMat(jlong address) {
   return *reinterpret_cast<cv::Mat*>(address);
 }
 
+// The same for an input the callee checks itself: null for address 0.
+inline const cv::Mat* HostMatOrNull(jlong address) {
+  return reinterpret_cast<const cv::Mat*>(address);
+}
+
 }  // namespace ocr::jni

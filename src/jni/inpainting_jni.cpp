@@ -1,6 +1,13 @@
 // Bridge of com.quenda.tessel.inpainting.InpaintingJNI: validates and copies
 // the host's arrays; the request itself is answered by the inpainting
 // subsystem.
+//
+// InpaintingRotRectImg in step order: here the rectangles, colour array and
+// output addresses are checked and copied (each refusal logged and -1) and
+// the image writer is bound; AnswerInpaintingRequest
+// (inpainting/driver/inpainting_request.cpp) runs the pipeline, checks its
+// answer, assigns the overlays and packs the colours; back here the packed
+// colours are written into the host's array.
 #include <jni.h>
 
 #include <cstdint>
@@ -18,12 +25,14 @@
 namespace {
 
 using ocr::jni::ArrayElements;
+using ocr::jni::OnRelease;
 
 // The host's input image; an address of 0 reads as an empty matrix, which
 // the pipeline refuses.
 const cv::Mat& InputImage(jlong address) {
   static const cv::Mat kEmpty;
-  return address != 0 ? ocr::jni::HostMat(address) : kEmpty;
+  const cv::Mat* image = ocr::jni::HostMatOrNull(address);
+  return image != nullptr ? *image : kEmpty;
 }
 
 size_t LengthOf(JNIEnv* env, jarray array) {
@@ -44,7 +53,7 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
   }
   // The entry insists on a copy of the rectangles; a VM that hands out the
   // array in place is treated as an error.
-  ArrayElements<jdoubleArray> rect_elements(env, rects);
+  ArrayElements<jdoubleArray> rect_elements(env, rects, OnRelease::kCopyBack);
   if (!rect_elements || !rect_elements.is_copy()) {
     OCR_LOGE(" Inpainting_Process: Error in copy rectangles in Java call");
     return -1;
@@ -56,7 +65,7 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
     return -1;
   }
   const std::vector<double> rect_values(rect_elements.data(), rect_elements.data() + length);
-  rect_elements.Release(0);
+  rect_elements.Release();
 
   if (output_addresses == nullptr ||
       LengthOf(env, output_addresses) != static_cast<size_t>(count)) {
@@ -65,7 +74,7 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
         "doesn't match the number of rectangles");
     return -1;
   }
-  ArrayElements<jlongArray> address_elements(env, output_addresses);
+  ArrayElements<jlongArray> address_elements(env, output_addresses, OnRelease::kCopyBack);
   if (!address_elements || !address_elements.is_copy()) {
     OCR_LOGE(" Inpainting_Process: Error in copy output matrix addresses in Java call");
     return -1;
@@ -78,7 +87,7 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
     }
     outputs[i] = &ocr::jni::HostMat(address_elements[i]);
   }
-  address_elements.Release(0);
+  address_elements.Release();
 
   OCR_LOGI("Inpainting_Process: Start vector images, call inpaintRotImg");
   // Binds the debug image writer to the host's class loader, so that the
@@ -97,9 +106,11 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
 JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_CalculateMeansStdDevs(
     JNIEnv* env, jclass, jlong image_address, jdoubleArray rects, jdoubleArray means,
     jdoubleArray std_devs) {
-  ArrayElements<jdoubleArray> rect_values(env, rects);
-  ArrayElements<jdoubleArray> mean_values(env, means);
-  ArrayElements<jdoubleArray> std_dev_values(env, std_devs);
+  // The rectangles are only read; the means and deviations go back to the
+  // host unless the call fails.
+  ArrayElements<jdoubleArray> rect_values(env, rects, OnRelease::kDiscard);
+  ArrayElements<jdoubleArray> mean_values(env, means, OnRelease::kCopyBack);
+  ArrayElements<jdoubleArray> std_dev_values(env, std_devs, OnRelease::kCopyBack);
   if ((rects != nullptr && !rect_values) || (means != nullptr && !mean_values) ||
       (std_devs != nullptr && !std_dev_values)) {
     OCR_LOGE("Color_Adjustment: Error in copy arrays in Java call");
@@ -110,10 +121,9 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Calculate
       mean_values.size(), std_dev_values.data(), std_dev_values.size());
   if (status != 0) {
     // Nothing was written; the host's arrays stay as they were.
-    mean_values.Release(JNI_ABORT);
-    std_dev_values.Release(JNI_ABORT);
+    mean_values.Discard();
+    std_dev_values.Discard();
   }
-  rect_values.Release(JNI_ABORT);
   return status;
 }
 

@@ -31,34 +31,35 @@ OCR_JNI_ARRAY_TRAITS(jintArray, jint, Int)
 OCR_JNI_ARRAY_TRAITS(jbyteArray, jbyte, Byte)
 #undef OCR_JNI_ARRAY_TRAITS
 
+// What releasing the elements does with what the engine wrote into them.
+enum class OnRelease : jint {
+  kCopyBack = 0,         // copy back into the Java array, then free
+  kDiscard = JNI_ABORT,  // free without copying back: the array stays as it was
+};
+
 // The elements of a primitive Java array, pinned or copied by the VM. A null
-// array gives no elements. Released with mode 0 (copy back and free) on
-// destruction unless Release or Abandon was called first.
+// array gives no elements. The release mode is chosen where the elements are
+// taken, so every path out of the bridge function releases them the same
+// way; Release frees them early, Discard frees them early without copying
+// back whatever the mode (a call that failed after writing nothing).
 template <typename ArrayT>
 class ArrayElements {
  public:
   using Element = typename ArrayTraits<ArrayT>::Element;
 
-  ArrayElements(JNIEnv* env, ArrayT array) : env_(env), array_(array) {
+  ArrayElements(JNIEnv* env, ArrayT array, OnRelease mode) : env_(env), array_(array), mode_(mode) {
     if (array_ != nullptr) {
       elements_ = ArrayTraits<ArrayT>::Get(env_, array_, &is_copy_);
       length_ = static_cast<size_t>(env_->GetArrayLength(array_));
     }
   }
-  ~ArrayElements() { Release(0); }
+  ~ArrayElements() { Release(); }
   ArrayElements(const ArrayElements&) = delete;
   ArrayElements& operator=(const ArrayElements&) = delete;
 
-  // Releases now with `mode` (0, JNI_COMMIT or JNI_ABORT); later calls do nothing.
-  void Release(jint mode) {
-    if (elements_ != nullptr && mode != JNI_COMMIT) {
-      ArrayTraits<ArrayT>::Release(env_, array_, elements_, mode);
-      elements_ = nullptr;
-    }
-  }
-  // Gives the elements up without releasing them (a path that deliberately
-  // keeps the VM's buffer).
-  void Abandon() { elements_ = nullptr; }
+  // Both release at most once; a later call, or the destructor, does nothing.
+  void Release() { ReleaseWith(mode_); }
+  void Discard() { ReleaseWith(OnRelease::kDiscard); }
 
   Element* data() const { return elements_; }
   size_t size() const { return length_; }
@@ -72,6 +73,14 @@ class ArrayElements {
   Element* elements_ = nullptr;
   size_t length_ = 0;
   jboolean is_copy_ = JNI_FALSE;
+  OnRelease mode_;
+
+  void ReleaseWith(OnRelease mode) {
+    if (elements_ != nullptr) {
+      ArrayTraits<ArrayT>::Release(env_, array_, elements_, static_cast<jint>(mode));
+      elements_ = nullptr;
+    }
+  }
 };
 
 // The modified UTF-8 chars of a Java string; null when the string is null or

@@ -34,7 +34,7 @@ jlong HandleOf(zeph::OcrTrackerRotRect* tracker) {
 // toward zero, as the host's OCR boxes have always been read.
 std::vector<cv::RotatedRect> ReadRects(JNIEnv* env, jdoubleArray array) {
   std::vector<cv::RotatedRect> rects;
-  ocr::jni::ArrayElements<jdoubleArray> values(env, array);
+  ocr::jni::ArrayElements<jdoubleArray> values(env, array, ocr::jni::OnRelease::kCopyBack);
   const size_t count = values.size() / kValsPerRect;
   rects.reserve(count);
   if (values.size() >= static_cast<size_t>(kValsPerRect)) {
@@ -55,7 +55,7 @@ jdoubleArray WriteRects(JNIEnv* env, const std::vector<cv::RotatedRect>& rects) 
     OCR_LOGE("Failed to create jdoublearray");
     return nullptr;
   }
-  ocr::jni::ArrayElements<jdoubleArray> values(env, array);
+  ocr::jni::ArrayElements<jdoubleArray> values(env, array, ocr::jni::OnRelease::kCopyBack);
   if (!values) {
     // The zero-filled array still goes back to the host.
     OCR_LOGE("Failed to get access to jdoublearray elements");

@@ -17,6 +17,7 @@
 namespace {
 
 using ocr::jni::ArrayElements;
+using ocr::jni::OnRelease;
 using ocr::jni::UtfChars;
 
 template <typename Element, typename ArrayT>
@@ -91,17 +92,18 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_renderOneFrame(
     JNIEnv* env, jclass, jlong imageMatAddr, jobjectArray texts, jdoubleArray patchRects,
     jdoubleArray textRects, jlongArray ids, jlongArray patchMatAddrs, jdoubleArray colorScales,
     jdoubleArray colorShifts, jintArray colors) {
-  const cv::Mat* image = imageMatAddr != 0 ? &ocr::jni::HostMat(imageMatAddr) : nullptr;
+  const cv::Mat* image = ocr::jni::HostMatOrNull(imageMatAddr);
   const std::size_t text_count =
       texts != nullptr ? static_cast<std::size_t>(env->GetArrayLength(texts)) : 0;
-  // Pinned for the call, released with mode 0 whatever happens.
-  const ArrayElements<jdoubleArray> patch_rects(env, patchRects);
-  const ArrayElements<jdoubleArray> text_rects(env, textRects);
-  const ArrayElements<jlongArray> id_values(env, ids);
-  const ArrayElements<jlongArray> patch_addresses(env, patchMatAddrs);
-  const ArrayElements<jdoubleArray> scales(env, colorScales);
-  const ArrayElements<jdoubleArray> shifts(env, colorShifts);
-  const ArrayElements<jintArray> colour_values(env, colors);
+  // Pinned for the call and copied back on release, as the host expects of
+  // every array it hands to this call.
+  const ArrayElements<jdoubleArray> patch_rects(env, patchRects, OnRelease::kCopyBack);
+  const ArrayElements<jdoubleArray> text_rects(env, textRects, OnRelease::kCopyBack);
+  const ArrayElements<jlongArray> id_values(env, ids, OnRelease::kCopyBack);
+  const ArrayElements<jlongArray> patch_addresses(env, patchMatAddrs, OnRelease::kCopyBack);
+  const ArrayElements<jdoubleArray> scales(env, colorScales, OnRelease::kCopyBack);
+  const ArrayElements<jdoubleArray> shifts(env, colorShifts, OnRelease::kCopyBack);
+  const ArrayElements<jintArray> colour_values(env, colors, OnRelease::kCopyBack);
 
   ocr_ar::FrameArrays arrays;
   arrays.patch_rects = View<double>(patch_rects);

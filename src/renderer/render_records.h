@@ -21,7 +21,10 @@ struct PositionScaleAngle {
 
 // A text colour as the host packs it into a Java int: the channels in byte
 // order from the least significant byte upwards, the fourth byte alpha
-// (0xFF000000 | B << 16 | G << 8 | R is opaque R, G, B).
+// (0xFF000000 | B << 16 | G << 8 | R is opaque R, G, B). The bridge works on
+// these bytes (colour correction is byte arithmetic); the scene handler turns
+// them into the kit's float Vexel::Color only where it hands a text its
+// colour.
 struct Color {
   std::uint8_t channel[4] = {0, 0, 0, 0xFF};
 
@@ -42,6 +45,21 @@ struct Color {
 
 // Opaque black, the colour of a text whose record is missing or unreadable.
 inline constexpr std::int32_t kDefaultTextColor = static_cast<std::int32_t>(0xFF000000u);
+
+// Where the background quad lies in normalised window units (-1..1 across
+// the window, y up), in the order left, top, right, bottom. The scene
+// handler keeps the quad's corners in this record; the bridge maps through
+// them.
+struct BackgroundCorners {
+  float left = 1.0f;
+  float top = 1.0f;
+  float right = 1.0f;
+  float bottom = 1.0f;
+
+  bool FillsWindow() const {
+    return left == -1.0f && top == 1.0f && right == 1.0f && bottom == -1.0f;
+  }
+};
 
 // The inpainted patch under one text: an RGBA image owned by the host, its
 // identifier (the patch is uploaded again only when it changes) and the

@@ -6,9 +6,7 @@
 #include <opencv2/core/mat.hpp>
 
 #include "common/log.h"
-#include "renderer/background_frame.h"
-#include "renderer/color_correction.h"
-#include "renderer/rect_mapping.h"
+#include "renderer/frame_mapping.h"
 #include "renderer/scene_handler.h"
 
 namespace ocr_ar::bridge {
@@ -44,6 +42,8 @@ CameraView CurrentCameraView(SceneHandler& handler) {
   return view;
 }
 
+// One text into slot `index`: both rectangles through the orientation into
+// camera space (the patch with its margin), the colour matched to the frame.
 void DrawText(SceneHandler& handler, std::size_t index, const TextRecord& record,
               const CameraView& view) {
   const ImageRect patch_rect =
@@ -167,23 +167,18 @@ void SetTranslationLanguageFont(const char* language, const char* fontPath) {
 }
 
 void RenderOneFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
-                    const FrameArrays& arrays) {
-  OCR_LOGI("Vexel: renderOneFrame image(%p %d %d) text(%d)",
-           image != nullptr ? static_cast<const void*>(image->data) : nullptr,
-           image != nullptr ? image->cols : 0, image != nullptr ? image->rows : 0,
-           static_cast<int>(textCount));
-  if (!UpdateFrame(image, textCount, readText, arrays))
-    return;
-  Guarded("Vexel: Caught exception in SceneHandler::RenderOneFrame.",
-          [] { SceneHandler::Instance()->RenderOneFrame(); });
-}
-
-bool UpdateFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
-                 const FrameArrays& arrays) {
+                    const FrameArrays& arrays, FrameEnd end) {
+  if (end == FrameEnd::kDraw) {
+    OCR_LOGI("Vexel: renderOneFrame image(%p %d %d) text(%d)",
+             image != nullptr ? static_cast<const void*>(image->data) : nullptr,
+             image != nullptr ? image->cols : 0, image != nullptr ? image->rows : 0,
+             static_cast<int>(textCount));
+  }
   SceneHandler& handler = *SceneHandler::Instance();
   if (!handler.HasRenderer())
-    return false;
+    return;
 
+  // 1. The camera frame into the background texture.
   if (image != nullptr && image->data != nullptr) {
     Guarded("Vexel: Caught exception in SceneHandler::UpdateBackgroundImage.", [&] {
       handler.UpdateBackgroundImage(BackgroundRgba(*image, s_background_scratch), image->cols,
@@ -191,33 +186,39 @@ bool UpdateFrame(const cv::Mat* image, std::size_t textCount, const TextReader& 
     });
   }
 
-  if (textCount < 1) {
-    s_render_translate = false;
+  // 2. The texts: none clears them all (kept for reuse); otherwise last
+  // frame's texts become reusable, each text is drawn into its slot and the
+  // slots past the last text are cleared.
+  s_render_translate = textCount > 0;
+  if (textCount == 0) {
     Guarded("Vexel: Caught exception in SceneHandler::ClearAllTextObjects.",
             [&] { handler.ClearAllTextObjects(false); });
-    return true;
+  } else {
+    if (!HasAllRects(arrays, textCount)) {
+      OCR_LOGE(
+          "Vexel: renderOneFrame needs 5 values per text in patchRects and textRects; "
+          "missing rectangles are drawn empty.");
+    }
+    Guarded("Vexel: Caught exception in SceneHandler::UpdateTextObjectCache.",
+            [&] { handler.UpdateTextObjectCache(); });
+    const CameraView view = CurrentCameraView(handler);
+    for (std::size_t i = 0; i < textCount; ++i) {
+      std::optional<std::string> text = readText(i);
+      if (!text)
+        OCR_LOGE("Vexel: GetStringUTFChars failed.");
+      const TextRecord record =
+          text ? UnpackTextRecord(arrays, i, std::move(*text)) : UnreadableTextRecord();
+      DrawText(handler, i, record, view);
+    }
+    Guarded("Vexel: Caught exception clearing remaining text objects.",
+            [&] { handler.ClearTextObjects(static_cast<unsigned int>(textCount), false); });
   }
 
-  s_render_translate = true;
-  if (!HasAllRects(arrays, textCount)) {
-    OCR_LOGE(
-        "Vexel: renderOneFrame needs 5 values per text in patchRects and textRects; "
-        "missing rectangles are drawn empty.");
+  // 3. The draw.
+  if (end == FrameEnd::kDraw) {
+    Guarded("Vexel: Caught exception in SceneHandler::RenderOneFrame.",
+            [&] { handler.RenderOneFrame(); });
   }
-  Guarded("Vexel: Caught exception in SceneHandler::UpdateTextObjectCache.",
-          [&] { handler.UpdateTextObjectCache(); });
-  const CameraView view = CurrentCameraView(handler);
-  for (std::size_t i = 0; i < textCount; ++i) {
-    std::optional<std::string> text = readText(i);
-    if (!text)
-      OCR_LOGE("Vexel: GetStringUTFChars failed.");
-    const TextRecord record =
-        text ? UnpackTextRecord(arrays, i, std::move(*text)) : UnreadableTextRecord();
-    DrawText(handler, i, record, view);
-  }
-  Guarded("Vexel: Caught exception clearing remaining text objects.",
-          [&] { handler.ClearTextObjects(static_cast<unsigned int>(textCount), false); });
-  return true;
 }
 
 bool GetRenderTranslate() {

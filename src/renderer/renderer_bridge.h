@@ -5,7 +5,7 @@
 #include <optional>
 #include <string>
 
-#include "renderer/frame_records.h"
+#include "renderer/frame_mapping.h"
 
 struct AAssetManager;
 struct ANativeWindow;
@@ -39,14 +39,19 @@ void SetTranslationLanguageFont(const char* language, const char* fontPath);
 // Text `index` of the frame, or nothing when its string cannot be read.
 using TextReader = std::function<std::optional<std::string>(std::size_t index)>;
 
+// What a frame call does after bringing the scene up to date.
+enum class FrameEnd {
+  kDraw,  // the host's renderOneFrame: logged, then drawn
+  // Neither the call's log line nor the draw: the bridge's own work alone,
+  // which is what the renderer benchmark measures apart from drawing.
+  kSceneOnly,
+};
+
 // One camera frame: the background image (null or empty: the background is
 // kept), `textCount` texts read through `readText` with the per-text arrays.
+// Without a renderer it does nothing beyond the log line.
 void RenderOneFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
-                    const FrameArrays& arrays);
-// RenderOneFrame without its log line and the draw: brings the scene up to
-// date with the frame. False when there is no renderer (nothing was done).
-bool UpdateFrame(const cv::Mat* image, std::size_t textCount, const TextReader& readText,
-                 const FrameArrays& arrays);
+                    const FrameArrays& arrays, FrameEnd end = FrameEnd::kDraw);
 
 bool GetRenderTranslate();
 

@@ -65,7 +65,7 @@ void SceneHandler::Init(ANativeWindow* window, AAssetManager* assets, int width,
 void SceneHandler::InitCamera(int width, int height, const Vexel::Vector3& /*cameraPosition*/,
                               const Vexel::Vector3& /*cameraTarget*/) {
   if (camera_ != nullptr && scene_ != nullptr) {
-    scene_->getRootNode()->removeChild(camera_.get());
+    Detach(*camera_);
     camera_.reset();
   }
   camera_ = std::make_unique<Vexel::Camera>();
@@ -81,7 +81,7 @@ void SceneHandler::DeleteCamera() {
   if (scene_ == nullptr)
     return;
   if (camera_ != nullptr)
-    scene_->getRootNode()->removeChild(camera_.get());
+    Detach(*camera_);
   camera_.reset();
 }
 
@@ -96,18 +96,20 @@ void SceneHandler::GetOrthoCameraWidthHeight(float* width, float* height) {
 }
 
 void SceneHandler::SetBackgroundRectCorners(float left, float top, float right, float bottom) {
-  background_left_ = left;
-  background_top_ = top;
-  background_right_ = right;
-  background_bottom_ = bottom;
+  background_corners_ = {left, top, right, bottom};
 }
 
 void SceneHandler::GetBackgroundRectCorners(float* left, float* top, float* right,
                                             float* bottom) const {
-  *left = background_left_;
-  *top = background_top_;
-  *right = background_right_;
-  *bottom = background_bottom_;
+  *left = background_corners_.left;
+  *top = background_corners_.top;
+  *right = background_corners_.right;
+  *bottom = background_corners_.bottom;
+}
+
+void SceneHandler::Detach(Vexel::Node& node) {
+  if (Vexel::Node* parent = node.getParent())
+    parent->removeChild(&node);
 }
 
 void SceneHandler::UpdateTextObjectCache() {
@@ -121,16 +123,13 @@ void SceneHandler::UpdateTextObjectCache() {
 void SceneHandler::ClearTextObjects(unsigned int firstIndex, bool force) {
   if (scene_ == nullptr)
     return;
-  Vexel::Node* root = scene_->getRootNode();
   for (auto entry = reusable_text_cache_.begin(); entry != reusable_text_cache_.end();) {
     auto& objects = entry->second;
     for (auto object = objects.begin(); object != objects.end();) {
       const unsigned int slot = object->slot_index;
       // A slot not drawn this frame leaves the scene.
-      if (slot >= firstIndex && slot < text_nodes_.size() && text_nodes_[slot] != nullptr &&
-          text_nodes_[slot]->getParent() == root) {
-        root->removeChild(text_nodes_[slot].get());
-      }
+      if (slot >= firstIndex && slot < text_nodes_.size() && text_nodes_[slot] != nullptr)
+        Detach(*text_nodes_[slot]);
       const unsigned int unused = ++unused_frame_counts_[object->text.get()];
       if (slot < firstIndex || (!force && unused < unused_frame_limit_)) {
         ++object;

@@ -131,7 +131,15 @@ class SceneHandler {
                   const double* colorScale, const double* colorShift);
   void PlaceText(Vexel::Text& text, const PositionScaleAngle& placement);
   Vexel::ResourceManager& Resources();
+  // Takes a node out of the scene graph (a no-op when it hangs nowhere); kit
+  // nodes are detached before they are destroyed.
+  static void Detach(Vexel::Node& node);
 
+  // Declaration order is teardown order, reversed: the destructor leaves the
+  // remaining members to the compiler, which destroys them from the last
+  // declared (background material) up to the kit, and the kit needs every
+  // object made through it gone first (scene before renderer before kit).
+  // Keep new kit-owned members below kit_, renderer_ and scene_.
   std::unique_ptr<Vexel::Kit> kit_;
   std::unique_ptr<Vexel::AndroidSurfaceRenderer> renderer_;
   std::unique_ptr<Vexel::Scene> scene_;
@@ -152,10 +160,7 @@ class SceneHandler {
   std::unique_ptr<Vexel::Mesh> background_mesh_;
   std::unique_ptr<Vexel::Texture> background_texture_;
   std::unique_ptr<Vexel::Material> background_material_;
-  float background_left_ = 1.0f;
-  float background_top_ = 1.0f;
-  float background_right_ = 1.0f;
-  float background_bottom_ = 1.0f;
+  BackgroundCorners background_corners_;
 
   static SceneHandler* instance_;
 };

@@ -75,8 +75,7 @@ void SceneHandler::CreateBackground(int width, int height, int rotation, float l
   SetBackgroundRectCorners(left, top, right, bottom);
 
   if (background_object_ != nullptr) {
-    if (Vexel::Node* parent = background_object_->getParent())
-      parent->removeChild(background_object_.get());
+    Detach(*background_object_);
     background_object_.reset();
   }
   background_material_.reset();

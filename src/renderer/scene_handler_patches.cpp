@@ -24,11 +24,6 @@ constexpr UnitSquareVertex kUnitSquare[4] = {
     {-0.5f, 0.5f, 0.0f, 0.0f},
 };
 
-void DetachFromParent(Vexel::Node& node) {
-  if (Vexel::Node* parent = node.getParent())
-    parent->removeChild(&node);
-}
-
 }  // namespace
 
 void PatchObjectDeleter::operator()(Vexel::Object* object) const {
@@ -108,7 +103,7 @@ void SceneHandler::UpdateOrCreateInpaintedRectObject(InpaintedRectObject& rect, 
 void SceneHandler::DeleteInpaintedRectObject(InpaintedRectObject& rect) {
   rect.texture.reset();
   if (rect.object != nullptr) {
-    DetachFromParent(*rect.object);
+    Detach(*rect.object);
     rect.object.reset();  // material 0 first, then the object
   }
   rect.id = -1;
@@ -117,7 +112,7 @@ void SceneHandler::DeleteInpaintedRectObject(InpaintedRectObject& rect) {
 void SceneHandler::DeleteInpaintedTextObject(InpaintedTextObject& text) {
   DeleteInpaintedRectObject(text.patch);
   if (text.text != nullptr) {
-    DetachFromParent(*text.text);
+    Detach(*text.text);
     text.text.reset();
   }
   text.slot_index = kRetiredSlotIndex;

@@ -84,6 +84,8 @@ void SceneHandler::DrawTextObject(unsigned int index, const std::string& text,
                                   int patchImageHeight, const PositionScaleAngle& patchPlacement) {
   if (scene_ == nullptr)
     throw std::logic_error("SceneHandler::DrawTextObject: no scene");
+  // Before the cache lookup: when no font is loaded yet this loads the
+  // language's font, and loading a font retires every text object.
   EnsureFont();
   InpaintedTextObject& object = UpdateOrCreateInpaintedTextObject(
       text, colour, id, patchData, patchImageWidth, patchImageHeight);

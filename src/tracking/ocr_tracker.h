@@ -52,6 +52,12 @@ class OcrTracker {
                                         std::vector<cv::Point2f>& b, T keep);
 
  protected:
+  // The object's address as the start and end log lines of both trackers
+  // print it.
+  static unsigned long Address(const void* object) {
+    return reinterpret_cast<unsigned long>(object);
+  }
+
   cv::Mat prev_gray_;
   std::vector<cv::Point2f> tracking_points_;
   std::vector<cv::Point2f> corner_points_;

@@ -13,8 +13,10 @@ constexpr float kMaxAngleChange = 35.0f;
 constexpr double kMaxScaleChange = 2.4;
 constexpr double kMinScaleChange = 0.4166666666666667;  // 1 / 2.4
 
-unsigned long Address(const void* object) {
-  return reinterpret_cast<unsigned long>(object);
+// All fields 0: how a lost region, and every region of a failed or rejected
+// frame, reaches the host.
+cv::RotatedRect LostRect() {
+  return cv::RotatedRect(cv::Point2f(0.0f, 0.0f), cv::Size2f(0.0f, 0.0f), 0.0f);
 }
 
 // Ratio of two non-zero lengths outside [1/2.4, 2.4]; the bounds themselves are accepted.
@@ -60,7 +62,7 @@ void OcrTrackerRotRect::UpdateTracker(const cv::Mat& frame, std::vector<cv::Rota
 
   const size_t n = ref_sizes_.size();
   rects->clear();
-  rects->resize(n, cv::RotatedRect(cv::Point2f(0.0f, 0.0f), cv::Size2f(0.0f, 0.0f), 0.0f));
+  rects->resize(n, LostRect());
   if (pts.size() != 4 * n) {
     OCR_LOGW(
         "OcrTrackerRotRect::UpdateTracker ERROR: There should be four points for each rect: %d != "
@@ -82,7 +84,7 @@ void OcrTrackerRotRect::UpdateTracker(const cv::Mat& frame, std::vector<cv::Rota
     if (len == 0.0) {
       // A quadrilateral collapsed to one point stays lost for good.
       ref_sizes_[i] = cv::Size2f(0.0f, 0.0f);
-      out = cv::RotatedRect(cv::Point2f(0.0f, 0.0f), cv::Size2f(0.0f, 0.0f), 0.0f);
+      out = LostRect();
       continue;
     }
     // The height follows the width with the region's reference aspect ratio.
@@ -95,7 +97,7 @@ void OcrTrackerRotRect::UpdateTracker(const cv::Mat& frame, std::vector<cv::Rota
   if (CheckTrackingAnglesScales(*rects, ref_rects_)) {
     OCR_LOGI("OcrTrackerRotRect::detect large angle/scale change. ");
     for (cv::RotatedRect& rect : *rects)
-      rect = cv::RotatedRect(cv::Point2f(0.0f, 0.0f), cv::Size2f(0.0f, 0.0f), 0.0f);
+      rect = LostRect();
   }
   // Even a zeroed result becomes the reference for the next frame.
   ref_rects_ = *rects;

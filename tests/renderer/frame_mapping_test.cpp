@@ -8,10 +8,7 @@
 
 #include "common/log.h"
 #include "recording_scene.h"
-#include "renderer/background_frame.h"
-#include "renderer/color_correction.h"
-#include "renderer/frame_records.h"
-#include "renderer/rect_mapping.h"
+#include "renderer/frame_mapping.h"
 
 namespace ocr_ar {
 namespace {

@@ -10,7 +10,7 @@
 
 #include "platform/desktop.h"
 #include "recording_kit.h"
-#include "renderer/frame_records.h"
+#include "renderer/frame_mapping.h"
 #include "renderer/renderer_bridge.h"
 #include "renderer/scene_handler.h"
 

@@ -15,6 +15,12 @@ inline constexpr int kMethodHls = 0;
 inline constexpr int kMethodClahe = 1;
 inline constexpr int kMethodPca = 2;
 
+// A patch with fewer rows or columns than this is small to the analysis: too
+// coarse for the arbiter's outline comparison and for thickening its edges
+// before they are traced, and (by rows) too short to dilate its top and
+// bottom rows. One threshold, so that the three stay in step.
+inline constexpr int kSmallPatchSide = 21;
+
 // Otsu threshold of the HLS lightness: 255 on pixels darker than the level
 // (assumes dark text on light; the arbiter fixes polarity).
 void HLSThreshold(const cv::Mat& src, cv::Mat* dst);
@@ -66,9 +72,12 @@ int GetFontMask(const cv::Mat& src, const cv::Mat& font_mask_in, const cv::Mat& 
                 const cv::Mat& contour_mask, cv::Mat& font_mask, int& vertical_partition);
 
 // The larger side of a vertical split at column `partition`: all rows, and
-// columns [0, p) when cols / 2 <= p < cols, else [p, cols) for 0 <= p < cols / 2,
-// else all columns.
+// the columns LongestWordColumns gives for the image's width.
 void GetLongestWordRange(const cv::Mat& img, int partition, cv::Range& rowRange,
                          cv::Range& colRange);
+
+// The columns of that side in a patch `cols` wide: [0, p) when
+// cols / 2 <= p < cols, else [p, cols) for 0 <= p < cols / 2, else all.
+cv::Range LongestWordColumns(int partition, int cols);
 
 }  // namespace ocr_inpainting

@@ -9,10 +9,6 @@
 namespace ocr_inpainting {
 namespace {
 
-// Below this size in either direction the outline comparison is too coarse
-// to decide between two plausible masks; the kept mask stays.
-constexpr int kMinOutlineCompareSize = 21;
-
 int CountDifferences(const cv::Mat& a, const cv::Mat& b) {
   cv::Mat diff;
   cv::absdiff(a, b, diff);
@@ -20,14 +16,6 @@ int CountDifferences(const cv::Mat& a, const cv::Mat& b) {
 }
 
 }  // namespace
-
-cv::Range CenterCropRange(int n) {
-  const int begin = static_cast<int>(n * 0.1);
-  const int end = static_cast<int>(n * 0.9);
-  if (begin < end)
-    return cv::Range(begin, end);
-  return cv::Range(0, n);
-}
 
 bool ValidBinaryResultCheck(cv::Mat mask, int total) {
   const int count = cv::countNonZero(mask);
@@ -55,8 +43,9 @@ void GetBinaryImgNormalized(const cv::Mat& ref, const cv::Mat& candidate, cv::Ma
     return;
   }
   // Both plausible: the one closer to the eroded outline of the text wins;
-  // a tie keeps the current mask.
-  if (same_matrix || ref.rows < kMinOutlineCompareSize || ref.cols < kMinOutlineCompareSize)
+  // a tie keeps the current mask, and so does a small patch, whose outline
+  // is too coarse to decide.
+  if (same_matrix || ref.rows < kSmallPatchSide || ref.cols < kSmallPatchSide)
     return;
   // Eroded as a copy: when ref is a region of a larger mask (one part of a
   // split patch), the pixels around the region must not take part.

@@ -118,16 +118,17 @@ int GetFontMask(const cv::Mat& src, const cv::Mat& /*font_mask_in*/, const cv::M
 
 void GetLongestWordRange(const cv::Mat& img, int partition, cv::Range& rowRange,
                          cv::Range& colRange) {
-  const int cols = img.cols;
-  const int half = cols / 2;
-  const int p = partition;
   rowRange = cv::Range(0, img.rows);
-  if (cols > p && half <= p) {
-    colRange = cv::Range(0, p);
-  } else {
-    const int start = (p >= 0 && half > p) ? p : 0;
-    colRange = cv::Range(start, cols);
-  }
+  colRange = LongestWordColumns(partition, img.cols);
+}
+
+cv::Range LongestWordColumns(int partition, int cols) {
+  const int half = cols / 2;
+  if (half <= partition && partition < cols)
+    return cv::Range(0, partition);
+  if (0 <= partition && partition < half)
+    return cv::Range(partition, cols);
+  return cv::Range(0, cols);
 }
 
 }  // namespace ocr_inpainting

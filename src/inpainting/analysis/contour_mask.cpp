@@ -15,14 +15,6 @@
 // does the same, so the part mask can be traced here and still be used
 // unchanged afterwards.
 namespace ocr_inpainting {
-namespace {
-
-// Below this size in either direction the edges are not thickened before
-// they are traced; a dilation would merge the strokes of a tiny patch.
-constexpr int kMinEdgeDilationSize = 21;
-
-}  // namespace
-
 int FindMask(const cv::Mat& src, cv::Mat* dst) {
   std::vector<std::vector<cv::Point>> contours;
   std::vector<cv::Vec4i> hierarchy;
@@ -45,7 +37,8 @@ int GetContourMask(const cv::Mat& grey, const cv::Mat& part_mask, cv::Mat& conto
   cv::Mat edges;
   RGBSobel(grey, &edges);
   cv::Mat filled = cv::Mat::zeros(grey.size(), CV_8UC1);
-  if (grey.cols >= kMinEdgeDilationSize && grey.rows >= kMinEdgeDilationSize) {
+  // A dilation would merge the strokes of a small patch.
+  if (grey.cols >= kSmallPatchSide && grey.rows >= kSmallPatchSide) {
     cv::dilate(edges, edges, Ellipse2x2Kernel(), cv::Point(-1, -1), 1, cv::BORDER_CONSTANT,
                cv::morphologyDefaultBorderValue());
   }

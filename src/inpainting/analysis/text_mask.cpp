@@ -13,11 +13,12 @@ namespace {
 
 constexpr int kMinMaskSize = 4;
 constexpr int kMinDilationSize = 5;
-// Below this height the top and bottom two rows are kept out of the
-// dilation as well, so a short patch keeps border pixels on every side.
-constexpr int kFullHeightDilationRows = 21;
-// Width of the side bands that are never dilated and cleared of contours.
-constexpr int kEdgeBand = 2;
+// Columns at each side that are never dilated and are cleared of contours.
+constexpr int kSideBandColumns = 2;
+// Rows at the top and bottom kept out of the dilation of a short patch
+// (fewer than kSmallPatchSide rows), so that it keeps border pixels on every
+// side.
+constexpr int kShortPatchRowMargin = 2;
 // Text found on less than this share of the patch is too sparse to trust.
 constexpr double kSparseTextShare = 0.05;
 // The fill needs at least this many kept pixels to draw from.
@@ -34,8 +35,8 @@ void ClearSideBands(cv::Mat& contour_mask) {
     OCR_LOGI("Inpainting_Process: Keep the same contour mask ");
     return;
   }
-  contour_mask.colRange(0, kEdgeBand).setTo(0);
-  contour_mask.colRange(contour_mask.cols - kEdgeBand, contour_mask.cols).setTo(0);
+  contour_mask.colRange(0, kSideBandColumns).setTo(0);
+  contour_mask.colRange(contour_mask.cols - kSideBandColumns, contour_mask.cols).setTo(0);
 }
 
 }  // namespace
@@ -45,9 +46,9 @@ void PartialImgDilation(cv::Mat& mask) {
     OCR_LOGW("Inpainting_Process: No dilation needed for 4*4 image. ");
     return;
   }
-  const int margin = mask.rows < kFullHeightDilationRows ? kEdgeBand : 0;
-  cv::Mat region =
-      mask(cv::Range(margin, mask.rows - margin), cv::Range(kEdgeBand, mask.cols - kEdgeBand));
+  const int margin = mask.rows < kSmallPatchSide ? kShortPatchRowMargin : 0;
+  cv::Mat region = mask(cv::Range(margin, mask.rows - margin),
+                        cv::Range(kSideBandColumns, mask.cols - kSideBandColumns));
   cv::dilate(region, region, Ellipse4x4Kernel(), cv::Point(-1, -1), 1, cv::BORDER_CONSTANT,
              cv::morphologyDefaultBorderValue());
 }

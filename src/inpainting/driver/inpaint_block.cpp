@@ -89,9 +89,6 @@ void PasteLineMasks(const BlockLines& lines, cv::Mat& block_mask, cv::Mat& block
 
 int InpaintImgBlockVersion(const cv::Mat& image, const std::vector<cv::RotatedRect>& rects,
                            std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors) {
-  overlays.resize(rects.size());
-  if (colors.size() < rects.size())
-    colors.resize(rects.size(), cv::Scalar::all(0));
   if (rects.empty())
     return -1;
 
@@ -105,7 +102,7 @@ int InpaintImgBlockVersion(const cv::Mat& image, const std::vector<cv::RotatedRe
   // warpAffine would take the image's size for an empty target size, so a
   // block without positive sides is not cut at all.
   cv::Mat block_patch;
-  if (block_size.width > 0 && block_size.height > 0) {
+  if (HasPositiveSides(block_size)) {
     cv::warpAffine(image, block_patch, transform, block_size,
                    cv::INTER_CUBIC | cv::WARP_INVERSE_MAP, cv::BORDER_REPLICATE);
   }

@@ -11,9 +11,11 @@ namespace ocr_inpainting {
 // block (longest side capped at 360) from `image` (CV_8UC3, R, G, B), builds
 // each line's text mask inside the block's edge mask, fills the whole block
 // once, then cuts every line's RGBA overlay out of the block overlay and
-// measures its text colour. overlays[i] and colors[i] belong to rects[i]
-// (`colors` must hold at least rects.size() entries). Returns 0, or -1 when
-// the block patch is smaller than 4x4 (overlays then stay empty).
+// measures its text colour. overlays[i] and colors[i] belong to rects[i]: both
+// must already hold one slot per rectangle (the block strategy sizes them),
+// as the lines write into them in parallel. Returns 0, or -1 when there is
+// no rectangle or the block patch is smaller than 4x4 (the slots then stay
+// as they are).
 int InpaintImgBlockVersion(const cv::Mat& image, const std::vector<cv::RotatedRect>& rects,
                            std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors);
 

@@ -6,6 +6,7 @@
 
 #include "common/log.h"
 #include "inpainting/driver/cut_into_vector.h"
+#include "inpainting/driver/rect_clipping.h"
 #include "inpainting/driver/rect_decoding.h"
 #include "inpainting/inpainting_constants.h"
 
@@ -27,10 +28,6 @@ cv::Rect2d TruncatedBox(const cv::RotatedRect& rect) {
                     std::trunc(box.height));
 }
 
-bool HasPositiveArea(const cv::Rect2d& box) {
-  return box.area() > 0.0;
-}
-
 // Members of the block that starts at `seed`: the following boxes, in order,
 // as long as each one joins.
 std::vector<unsigned int> GrowBlock(const std::vector<cv::Rect2d>& boxes, unsigned int seed,
@@ -40,12 +37,12 @@ std::vector<unsigned int> GrowBlock(const std::vector<cv::Rect2d>& boxes, unsign
   double previous_area = united.area();
   for (unsigned int j = seed + 1; j < boxes.size(); ++j) {
     const cv::Rect2d& box = boxes[j];
-    if (!HasPositiveArea(box) || image_area * kMaxBlockImageShare < united.area() ||
+    if (!HasPositiveSides(box) || image_area * kMaxBlockImageShare < united.area() ||
         group.size() > max_members) {
       break;
     }
     const cv::Rect2d grown = united | box;
-    if (!HasPositiveArea(grown))
+    if (!HasPositiveSides(grown))
       break;
     const double extra = (grown.area() - previous_area - box.area()) / box.area();
     if (!(extra < kMaxExtraGrowth)) {
@@ -104,7 +101,7 @@ void SmartSepLineAndBlock(const cv::Mat& image, const std::vector<double>& value
 
   std::set<unsigned int> tagged;
   for (unsigned int i = 0; i < count; ++i) {
-    if (tagged.count(i) != 0 || !HasPositiveArea(boxes[i]))
+    if (tagged.count(i) != 0 || !HasPositiveSides(boxes[i]))
       continue;
     const std::vector<unsigned int> group = GrowBlock(boxes, i, max_members, image_area);
     if (group.size() <= 1)

@@ -11,15 +11,12 @@
 #include "common/log.h"
 #include "inpainting/driver/min_area_rect.h"
 #include "inpainting/driver/numeric_casts.h"
+#include "inpainting/driver/rect_clipping.h"
 
 namespace ocr_inpainting {
 namespace {
 
 constexpr double kDegreesToRadians = 0.017453292519943295;
-
-bool HasPositiveSides(const cv::Size& size) {
-  return size.width >= 1 && size.height >= 1;
-}
 
 void WarpToPatch(const cv::Mat& image, const cv::Mat& transform, const cv::Size& size,
                  cv::Mat& patch) {

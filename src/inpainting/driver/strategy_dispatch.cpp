@@ -21,11 +21,17 @@ namespace {
 
 enum class RequestCheck { kAccepted, kRefused, kImageTooSmall };
 
-// The checks every strategy makes before it decodes the rectangles. The
-// request entry makes them too, but leaves the progress and too-small
-// messages to the strategies (`announce` false).
-RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& values,
-                          bool announce = true) {
+// What a check logs besides its refusals. Each strategy checks the request
+// it is given and logs its progress (the value count) and the too-small
+// notice. InpaintingRotImg checks the whole request once before the
+// strategies, only to turn a refusal into its -1 (the smart version reports
+// success whatever its strategies return); the strategies then check again
+// and log those two lines, so the early check leaves them out.
+enum class CheckLog { kProgress, kRefusalsOnly };
+
+// The checks every strategy makes before it decodes the rectangles.
+RequestCheck CheckRequest(const cv::Mat& image, const std::vector<double>& values, CheckLog log) {
+  const bool announce = log == CheckLog::kProgress;
   if (image.data == nullptr || image.empty()) {
     OCR_LOGE(" Inpainting_Process: Error in input of inpainting. Empty data.");
     return RequestCheck::kRefused;
@@ -58,7 +64,7 @@ std::optional<int> BeginStrategy(const char* banner, const cv::Mat& image,
                                  std::vector<cv::Scalar>& colors,
                                  std::vector<cv::RotatedRect>& rects) {
   OCR_LOGI("%s", banner);
-  switch (CheckRequest(image, values)) {
+  switch (CheckRequest(image, values, CheckLog::kProgress)) {
     case RequestCheck::kRefused:
       return -1;
     case RequestCheck::kImageTooSmall:
@@ -87,9 +93,7 @@ cv::Mat TransparentOverlay(const cv::Mat& patch) {
 
 int InpaintingRotImg(const cv::Mat& image, const std::vector<double>& values,
                      std::vector<cv::Mat>& overlays, std::vector<cv::Scalar>& colors) {
-  // A request that every strategy would refuse is answered here: the smart
-  // version reports success whatever its strategies return.
-  if (CheckRequest(image, values, false) == RequestCheck::kRefused)
+  if (CheckRequest(image, values, CheckLog::kRefusalsOnly) == RequestCheck::kRefused)
     return -1;
   InpaintingRotImgSmartVersion(image, values, overlays, colors);
   return 0;
@@ -104,7 +108,9 @@ int InpaintingRotImgSmartVersion(const cv::Mat& image, const std::vector<double>
   SmartSepLineAndBlock(image, values, block_values, line_values, block_indices, line_indices);
 
   // Result slots are sized before the loops, down to every block's members,
-  // and each iteration writes only its own.
+  // and each iteration writes only its own. The strategies size them the
+  // same way (one per rectangle they are given), and a strategy that stops
+  // early leaves them as they are, so the copy back below needs no checks.
   const size_t block_count = block_values.size();
   std::vector<std::vector<cv::Mat>> block_overlays(block_count);
   std::vector<std::vector<cv::Scalar>> block_colors(block_count);
@@ -148,7 +154,7 @@ int InpaintingRotImgSmartVersion(const cv::Mat& image, const std::vector<double>
   const size_t count = values.size() / kValsPerRect;
   overlays.resize(count);
   colors.resize(count);
-  for (size_t k = 0; k < line_indices.size() && k < line_overlays.size(); ++k) {
+  for (size_t k = 0; k < line_indices.size(); ++k) {
     overlays[line_indices[k]] = line_overlays[k];
     colors[line_indices[k]] = line_colors[k];
   }
@@ -158,10 +164,8 @@ int InpaintingRotImgSmartVersion(const cv::Mat& image, const std::vector<double>
     for (size_t m = 0; m < block_indices[b].size(); ++m) {
       OCR_LOGD("kavoSmart block_result idx %d copyIndex %d", static_cast<int>(b),
                static_cast<int>(m));
-      if (m < block_overlays[b].size())
-        overlays[block_indices[b][m]] = block_overlays[b][m];
-      if (m < block_colors[b].size())
-        colors[block_indices[b][m]] = block_colors[b][m];
+      overlays[block_indices[b][m]] = block_overlays[b][m];
+      colors[block_indices[b][m]] = block_colors[b][m];
     }
   }
   return 0;
