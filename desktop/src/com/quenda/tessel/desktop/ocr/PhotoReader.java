@@ -108,18 +108,19 @@ public final class PhotoReader implements AutoCloseable {
     List<TextLine> lines = new LineGrouper().group(components);
     List<RotatedRect> rects = new ArrayList<>();
     for (TextLine l : lines) {
-      rects.add(new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
-          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle));
+      RotatedRect r = new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
+          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle);
+      rects.add(TrailingMarks.widen(grey, r, l.bright));
     }
     List<List<Word>> words = recognise(grey, lines, rects, false);
     RecognizedLine[] best = new RecognizedLine[lines.size()];
     List<Integer> retry = new ArrayList<>();
     for (int i = 0; i < lines.size(); i++) {
-      List<Word> w = TextFilter.trim(words.get(i));
-      if (TextFilter.isText(w)) {
-        best[i] = result(lines.get(i), rects.get(i), w, false, f);
+      TextFilter.Reading r = TextFilter.accept(words.get(i));
+      if (r != null) {
+        best[i] = result(lines.get(i), rects.get(i), r, false, f);
       }
-      if (best[i] == null || best[i].confidence < SURE_CONFIDENCE) {
+      if (r == null || r.confidence() < SURE_CONFIDENCE) {
         retry.add(i);
       }
     }
@@ -132,10 +133,9 @@ public final class PhotoReader implements AutoCloseable {
     List<List<Word>> turned = recognise(grey, retryLines, retryRects, true);
     for (int k = 0; k < retry.size(); k++) {
       int i = retry.get(k);
-      List<Word> w = TextFilter.trim(turned.get(k));
-      if (TextFilter.isText(w)
-          && (best[i] == null || TextFilter.confidence(w) > best[i].confidence)) {
-        best[i] = result(retryLines.get(k), retryRects.get(k), w, true, f);
+      TextFilter.Reading r = TextFilter.accept(turned.get(k));
+      if (r != null && (best[i] == null || r.confidence() > best[i].confidence)) {
+        best[i] = result(retryLines.get(k), retryRects.get(k), r, true, f);
       }
     }
     List<RecognizedLine> out = new ArrayList<>();
@@ -174,10 +174,10 @@ public final class PhotoReader implements AutoCloseable {
    * candidates under the words.
    */
   private static RecognizedLine result(
-      TextLine line, RotatedRect rect, List<Word> words, boolean upsideDown, double f) {
+      TextLine line, RotatedRect rect, TextFilter.Reading reading, boolean upsideDown, double f) {
     double from = Double.MAX_VALUE;
     double to = -Double.MAX_VALUE;
-    for (Word w : words) {
+    for (Word w : reading.words()) {
       double a = LineRectifier.alongLine(rect, w.left(), upsideDown);
       double b = LineRectifier.alongLine(rect, w.left() + w.width(), upsideDown);
       from = Math.min(from, Math.min(a, b));
@@ -203,8 +203,8 @@ public final class PhotoReader implements AutoCloseable {
       }
     }
     double angle = upsideDown ? reverse(r.angle) : r.angle;
-    return new RecognizedLine(TextFilter.text(words), new RotatedRect(r.center, r.size, angle),
-        TextFilter.confidence(words));
+    return new RecognizedLine(
+        reading.text(), new RotatedRect(r.center, r.size, angle), reading.confidence());
   }
 
   private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,
