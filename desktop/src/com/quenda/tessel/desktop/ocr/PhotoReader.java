@@ -94,18 +94,28 @@ public final class PhotoReader implements AutoCloseable {
     if (small != grey) {
       small.release();
     }
-    if (mayTurn && sideways(components)) {
-      release(components);
-      int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
-      turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
-      Mat turned = PageOrientation.turn(grey, turn);
-      try {
-        return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
-      } finally {
-        turned.release();
+    try {
+      if (mayTurn && sideways(components)) {
+        int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
+        turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
+        Mat turned = PageOrientation.turn(grey, turn);
+        try {
+          return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
+        } finally {
+          turned.release();
+        }
+      }
+      return readRows(grey, new LineGrouper().group(components), f);
+    } finally {
+      for (Component c : components) {
+        c.points.release();
       }
     }
-    List<TextLine> lines = new LineGrouper().group(components);
+  }
+
+  /** Reads the rows found at detection scale {@code f}, unsure ones also upside down. */
+  private List<RecognizedLine> readRows(Mat grey, List<TextLine> lines, double f)
+      throws HostException {
     List<RotatedRect> rects = new ArrayList<>();
     for (TextLine l : lines) {
       RotatedRect r = new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
@@ -144,7 +154,6 @@ public final class PhotoReader implements AutoCloseable {
         out.add(l);
       }
     }
-    release(components);
     return out;
   }
 
@@ -160,12 +169,6 @@ public final class PhotoReader implements AutoCloseable {
     int across = LineGrouper.candidatesInRows(components);
     int down = LineGrouper.candidatesInRows(transposed);
     return down >= 30 && down > 2 * across;
-  }
-
-  private static void release(List<Component> components) {
-    for (Component c : components) {
-      c.points.release();
-    }
   }
 
   /**
