@@ -6,13 +6,11 @@ import java.util.Comparator;
 import java.util.HashMap;
 import java.util.List;
 import java.util.Map;
-import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.MatOfPoint2f;
 import org.opencv.core.Point;
 import org.opencv.core.RotatedRect;
-import org.opencv.core.Size;
 import org.opencv.imgproc.Imgproc;
 
 /**
@@ -25,8 +23,10 @@ import org.opencv.imgproc.Imgproc;
  * above and below, on a page, do not. Second, each linked group's direction is fitted through its
  * centres and the links are redone within 20° of it, which cuts groups that bridged two lines.
  *
- * <p>Rows of fewer than three candidates (two blobs always line up) or narrower than 1.3 times
- * their height are dropped; the rectangle is {@link InkRect}'s.
+ * <p>Within a row, candidates over 1.45 times its median height are left out (letters fused with
+ * the line above); rows of fewer than three candidates (two blobs always line up) or narrower than
+ * 1.3 times their height are dropped; the rectangle is {@link InkRect}'s. Overlapping rows keep
+ * the one with more candidates.
  */
 final class LineGrouper {
   private static final double MAX_LINK_ANGLE = 40;

@@ -94,32 +94,43 @@ public final class PhotoReader implements AutoCloseable {
     if (small != grey) {
       small.release();
     }
-    if (mayTurn && sideways(components)) {
-      release(components);
-      int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
-      turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
-      Mat turned = PageOrientation.turn(grey, turn);
-      try {
-        return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
-      } finally {
-        turned.release();
+    try {
+      if (mayTurn && sideways(components)) {
+        int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
+        turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
+        Mat turned = PageOrientation.turn(grey, turn);
+        try {
+          return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
+        } finally {
+          turned.release();
+        }
+      }
+      return readRows(grey, new LineGrouper().group(components), f);
+    } finally {
+      for (Component c : components) {
+        c.points.release();
       }
     }
-    List<TextLine> lines = new LineGrouper().group(components);
+  }
+
+  /** Reads the rows found at detection scale {@code f}, unsure ones also upside down. */
+  private List<RecognizedLine> readRows(Mat grey, List<TextLine> lines, double f)
+      throws HostException {
     List<RotatedRect> rects = new ArrayList<>();
     for (TextLine l : lines) {
-      rects.add(new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
-          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle));
+      RotatedRect r = new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
+          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle);
+      rects.add(TrailingMarks.widen(grey, r, l.bright));
     }
     List<List<Word>> words = recognise(grey, lines, rects, false);
     RecognizedLine[] best = new RecognizedLine[lines.size()];
     List<Integer> retry = new ArrayList<>();
     for (int i = 0; i < lines.size(); i++) {
-      List<Word> w = TextFilter.trim(words.get(i));
-      if (TextFilter.isText(w)) {
-        best[i] = result(lines.get(i), rects.get(i), w, false, f);
+      TextFilter.Reading r = TextFilter.accept(words.get(i));
+      if (r != null) {
+        best[i] = result(lines.get(i), rects.get(i), r, false, f);
       }
-      if (best[i] == null || best[i].confidence < SURE_CONFIDENCE) {
+      if (r == null || r.confidence() < SURE_CONFIDENCE) {
         retry.add(i);
       }
     }
@@ -132,10 +143,9 @@ public final class PhotoReader implements AutoCloseable {
     List<List<Word>> turned = recognise(grey, retryLines, retryRects, true);
     for (int k = 0; k < retry.size(); k++) {
       int i = retry.get(k);
-      List<Word> w = TextFilter.trim(turned.get(k));
-      if (TextFilter.isText(w)
-          && (best[i] == null || TextFilter.confidence(w) > best[i].confidence)) {
-        best[i] = result(retryLines.get(k), retryRects.get(k), w, true, f);
+      TextFilter.Reading r = TextFilter.accept(turned.get(k));
+      if (r != null && (best[i] == null || r.confidence() > best[i].confidence)) {
+        best[i] = result(retryLines.get(k), retryRects.get(k), r, true, f);
       }
     }
     List<RecognizedLine> out = new ArrayList<>();
@@ -144,7 +154,6 @@ public final class PhotoReader implements AutoCloseable {
         out.add(l);
       }
     }
-    release(components);
     return out;
   }
 
@@ -162,22 +171,16 @@ public final class PhotoReader implements AutoCloseable {
     return down >= 30 && down > 2 * across;
   }
 
-  private static void release(List<Component> components) {
-    for (Component c : components) {
-      c.points.release();
-    }
-  }
-
   /**
    * The line as read. When the words kept span less than the line (a fragment of a plate's edge
    * or texture joined the row but was not read as text), the rectangle is remade from the
    * candidates under the words.
    */
   private static RecognizedLine result(
-      TextLine line, RotatedRect rect, List<Word> words, boolean upsideDown, double f) {
+      TextLine line, RotatedRect rect, TextFilter.Reading reading, boolean upsideDown, double f) {
     double from = Double.MAX_VALUE;
     double to = -Double.MAX_VALUE;
-    for (Word w : words) {
+    for (Word w : reading.words()) {
       double a = LineRectifier.alongLine(rect, w.left(), upsideDown);
       double b = LineRectifier.alongLine(rect, w.left() + w.width(), upsideDown);
       from = Math.min(from, Math.min(a, b));
@@ -203,8 +206,8 @@ public final class PhotoReader implements AutoCloseable {
       }
     }
     double angle = upsideDown ? reverse(r.angle) : r.angle;
-    return new RecognizedLine(TextFilter.text(words), new RotatedRect(r.center, r.size, angle),
-        TextFilter.confidence(words));
+    return new RecognizedLine(
+        reading.text(), new RotatedRect(r.center, r.size, angle), reading.confidence());
   }
 
   private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,

@@ -66,6 +66,7 @@ class PhotoReaderTest {
         found += m.wordsFound();
         assertNotNull(m.read, "line not found on the page turned by " + turn + ": " + m);
         assertTrue(m.angleError() <= 2, "reading direction off: " + m);
+        assertTrue(m.centreError() <= 3, "centre error " + m.centreError() + ": " + m);
       }
       assertTrue(found >= 0.9 * words, found + " of " + words + " words, page turned " + turn);
       page.release();

@@ -5,7 +5,10 @@ import java.util.ArrayList;
 import java.util.List;
 import java.util.Locale;
 
-/** Compares read lines with a scene's truth: nearest line, words found, rectangle errors. */
+/**
+ * Compares read lines with a scene's truth: the nearest read line to each true one, the words
+ * found and the rectangle errors. Shared by the tests and {@link ReadingMeasure}.
+ */
 final class LineMatch {
   final SceneLine truth;
   /** Null when no read line lies within the truth's height of it. */
