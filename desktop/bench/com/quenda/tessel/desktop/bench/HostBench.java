@@ -18,6 +18,7 @@ import com.quenda.tessel.desktop.translate.Translators;
 import com.quenda.tessel.desktop.video.VideoCommand;
 import com.quenda.tessel.desktop.video.VideoResult;
 import java.io.ByteArrayOutputStream;
+import java.io.IOException;
 import java.io.PrintStream;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
@@ -27,9 +28,6 @@ import java.util.Arrays;
 import java.util.Collections;
 import java.util.List;
 import org.opencv.core.Core;
-import org.opencv.core.Mat;
-import org.opencv.imgcodecs.Imgcodecs;
-import org.opencv.imgproc.Imgproc;
 
 /**
  * Measures the desktop host on bundled inputs (not a test: it prints figures, on standard error):
@@ -120,12 +118,9 @@ public final class HostBench {
         within);
   }
 
-  private static Path write(Scene scene, Path dir) {
+  private static Path write(Scene scene, Path dir) throws IOException {
     Path file = dir.resolve(scene.name + ".png");
-    Mat bgr = new Mat();
-    Imgproc.cvtColor(scene.rgb, bgr, Imgproc.COLOR_RGB2BGR);
-    Imgcodecs.imwrite(file.toString(), bgr);
-    bgr.release();
+    scene.writePng(file);
     scene.release();
     return file;
   }

@@ -6,7 +6,6 @@ import java.util.List;
 import org.opencv.core.Core;
 import org.opencv.core.Mat;
 import org.opencv.core.Size;
-import org.opencv.imgcodecs.Imgcodecs;
 import org.opencv.imgproc.Imgproc;
 import org.opencv.videoio.VideoWriter;
 
@@ -76,14 +75,10 @@ public final class BundledInputs {
   }
 
   private static void write(Scene scene, File directory) throws IOException {
-    File file = new File(directory, scene.name + ".png");
-    Mat bgr = new Mat();
-    Imgproc.cvtColor(scene.rgb, bgr, Imgproc.COLOR_RGB2BGR);
-    boolean written = Imgcodecs.imwrite(file.getPath(), bgr);
-    bgr.release();
-    scene.release();
-    if (!written) {
-      throw new IOException("cannot write " + file);
+    try {
+      scene.writePng(new File(directory, scene.name + ".png").toPath());
+    } finally {
+      scene.release();
     }
   }
 }

@@ -13,6 +13,7 @@ import com.quenda.tessel.desktop.scenes.Scenes;
 import com.quenda.tessel.desktop.scenes.SignScene;
 import com.quenda.tessel.desktop.scenes.SignStyle;
 import java.io.ByteArrayOutputStream;
+import java.io.IOException;
 import java.io.PrintStream;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
@@ -106,11 +107,8 @@ class PhotoTranslateTest {
     assertTrue(still.contains("zorbly"), "read " + still);
   }
 
-  private static void write(Scene scene) {
-    Mat bgr = new Mat();
-    Imgproc.cvtColor(scene.rgb, bgr, Imgproc.COLOR_RGB2BGR);
-    Imgcodecs.imwrite(input(scene.name), bgr);
-    bgr.release();
+  private static void write(Scene scene) throws IOException {
+    scene.writePng(Path.of(input(scene.name)));
   }
 
   private static String input(String name) {
