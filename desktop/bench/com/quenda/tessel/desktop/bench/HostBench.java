@@ -110,12 +110,20 @@ public final class HostBench {
       }
       result.release();
     }
+    printRatios("all translated lines", ratios);
+    printRatios("translation at most 10% longer", notLonger);
+  }
+
+  private static void printRatios(String which, List<Double> ratios) {
+    if (ratios.isEmpty()) {
+      return;
+    }
     Collections.sort(ratios);
     long within = ratios.stream().filter(r -> Math.abs(r - 1) <= 0.15).count();
-    System.err.printf("capital height drawn/original over %d lines: median %.2f, range %.2f-%.2f, "
-            + "%d within 15%% (the rest narrowed to fit the width)%n",
-        ratios.size(), ratios.get(ratios.size() / 2), ratios.get(0), ratios.get(ratios.size() - 1),
-        within);
+    System.err.printf("capital height drawn/original, %s: %d lines, median %.2f, "
+            + "range %.2f-%.2f, %d within 15%%%n",
+        which, ratios.size(), ratios.get(ratios.size() / 2), ratios.get(0),
+        ratios.get(ratios.size() - 1), within);
   }
 
   private static Path write(Scene scene, Path dir) throws IOException {
@@ -137,7 +145,11 @@ public final class HostBench {
         result.p95Millis("track"), result.medianMillis("draw"), result.p95Millis("draw"),
         result.medianMillis("encode"), result.p95Millis("encode"), result.medianMillis("frame"),
         result.p95Millis("frame"), result.keyframes.size(), result.medianMillis("ocr"),
-        live ? String.format("; keyframe to overlay %s ms", result.latencies) : "");
+        live ? String.format("; keyframe to overlay %s ms; drawn frame median with the worker "
+                + "busy %.1f ms, idle %.1f ms",
+            result.latencies, result.medianMillis("drawn frame, worker busy"),
+            result.medianMillis("drawn frame, worker idle"))
+             : "");
   }
 
   private static double median(double[] values) {

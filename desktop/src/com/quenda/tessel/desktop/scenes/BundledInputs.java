@@ -52,7 +52,7 @@ public final class BundledInputs {
         new CameraSequence.Pose(600, 340, 1.15, 4), new CameraSequence.Pose(700, 390, 1.3, -3),
         new CameraSequence.Pose(650, 360, 1.1, 1));
     return new CameraSequence(
-        Scenes.bundled("station"), new Size(Scenes.WIDTH, Scenes.HEIGHT), poses, 90);
+        Scenes.bundled("station"), new Size(Scenes.WIDTH, Scenes.HEIGHT), poses, frames);
   }
 
   /** Writes every frame of {@code sequence} as an H.264 video at 30 frames per second. */
