@@ -144,6 +144,9 @@ public final class VideoJob {
     }
 
     private void process(Mat frame, int k) throws HostException {
+      if (k == 0) {
+        drawer(frame);  // as a phone starts its renderer with the surface, not at the first text
+      }
       long start = System.nanoTime();
       boolean lostAll = track(frame);
       if (live) {

@@ -172,7 +172,8 @@ class VideoLoopTest {
     assertTrue(firstDrawn >= slowOcr * 15 / 1000, "first overlay at frame " + firstDrawn);
     double worst = worstError(steady, result, firstDrawn);
     assertTrue(worst <= MAX_ERROR_PX, "worst error " + worst);
-    assertTrue(result.longestFrameMillis() < slowOcr / 3,
+    // A frame that waited for the keyframe work would take longer than the slowed OCR alone.
+    assertTrue(result.longestFrameMillis() < slowOcr,
         "a frame was held " + result.longestFrameMillis() + " ms");
     assertTrue(result.latencies.get(0) >= slowOcr, "latency " + result.latencies);
   }
