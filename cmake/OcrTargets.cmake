@@ -20,3 +20,31 @@ function(ocr_subsystem name)
   ocr_warnings(${name})
   set_property(GLOBAL APPEND PROPERTY OCR_SUBSYSTEM_LIBS ${name})
 endfunction()
+
+# One ctest entry per *Test.java among SOURCES (below TEST_DIR), run by the JUnit console
+# launcher in a JVM with JVM_FLAGS and CLASSPATH, labelled <prefix>; the engine's log of each goes
+# to <build>/<prefix>-logs/<Test>.log.
+#   ocr_add_junit_tests(<prefix> TEST_DIR dir SOURCES ... CLASSPATH cp JVM_FLAGS ...
+#                       WORKING_DIRECTORY dir)
+function(ocr_add_junit_tests prefix)
+  cmake_parse_arguments(ARG "" "TEST_DIR;CLASSPATH;WORKING_DIRECTORY" "SOURCES;JVM_FLAGS" ${ARGN})
+  file(MAKE_DIRECTORY ${CMAKE_BINARY_DIR}/${prefix}-logs ${ARG_WORKING_DIRECTORY})
+  foreach(source ${ARG_SOURCES})
+    if(NOT source MATCHES "Test\\.java$")
+      continue()
+    endif()
+    file(RELATIVE_PATH relative ${ARG_TEST_DIR} ${source})
+    string(REGEX REPLACE "\\.java$" "" class_path ${relative})
+    string(REPLACE "/" "." class_name ${class_path})
+    get_filename_component(simple_name ${class_path} NAME)
+    add_test(NAME ${prefix}.${simple_name}
+             COMMAND ${Java_JAVA_EXECUTABLE} ${ARG_JVM_FLAGS}
+                     -jar ${JUNIT_CONSOLE_JAR} --disable-banner --details=tree
+                     --fail-if-no-tests --disable-ansi-colors
+                     -cp ${ARG_CLASSPATH} --select-class=${class_name})
+    set_tests_properties(${prefix}.${simple_name} PROPERTIES
+      ENVIRONMENT "OCRAR_LOG_FILE=${CMAKE_BINARY_DIR}/${prefix}-logs/${simple_name}.log;OCRAR_LOG_LEVEL=5"
+      WORKING_DIRECTORY ${ARG_WORKING_DIRECTORY}
+      LABELS ${prefix})
+  endforeach()
+endfunction()

@@ -35,14 +35,7 @@ final class LineGrouper {
   List<TextLine> group(List<Component> components) {
     List<TextLine> lines = new ArrayList<>();
     for (boolean bright : new boolean[] {false, true}) {
-      List<Component> same = new ArrayList<>();
-      for (Component c : components) {
-        if (c.bright == bright) {
-          same.add(c);
-        }
-      }
-      same.sort(Comparator.comparingInt(c -> c.box.x));
-      for (List<Component> g : link(same, Double.NaN)) {
+      for (List<Component> g : link(ofPolarity(components, bright), Double.NaN)) {
         double direction = fitDirection(g);
         for (List<Component> row : link(g, direction)) {
           TextLine line = line(row, direction, bright);
@@ -55,6 +48,18 @@ final class LineGrouper {
     return dropOverlaps(lines);
   }
 
+  /** The candidates of one polarity, left to right: lines are built from one polarity only. */
+  private static List<Component> ofPolarity(List<Component> components, boolean bright) {
+    List<Component> same = new ArrayList<>();
+    for (Component c : components) {
+      if (c.bright == bright) {
+        same.add(c);
+      }
+    }
+    same.sort(Comparator.comparingInt(c -> c.box.x));
+    return same;
+  }
+
   /**
    * How many candidates stand in linked rows of three or more, without fitting the rows: evidence
    * of how much text runs across the picture, cheap enough to compare with its transposition.
@@ -62,14 +67,7 @@ final class LineGrouper {
   static int candidatesInRows(List<Component> components) {
     int n = 0;
     for (boolean bright : new boolean[] {false, true}) {
-      List<Component> same = new ArrayList<>();
-      for (Component c : components) {
-        if (c.bright == bright) {
-          same.add(c);
-        }
-      }
-      same.sort(Comparator.comparingInt(c -> c.box.x));
-      for (List<Component> g : link(same, Double.NaN)) {
+      for (List<Component> g : link(ofPolarity(components, bright), Double.NaN)) {
         n += g.size() >= 3 ? g.size() : 0;
       }
     }
