@@ -145,7 +145,7 @@ public final class VideoJob {
 
     private void process(Mat frame, int k) throws HostException {
       if (k == 0) {
-        drawer(frame);  // as a phone starts its renderer with the surface, not at the first text
+        drawer(frame); // as a phone starts its renderer with the surface, not at the first text
       }
       long start = System.nanoTime();
       boolean lostAll = track(frame);
