@@ -7,9 +7,11 @@ import java.util.List;
 /** The parsed command line: a mode, its inputs and the options common to every mode. */
 public final class CommandLine {
   public static final String USAGE = String.join("\n",
-      "usage: translate.sh photo IMAGE... --from LANG --to LANG --out DIR [options]", "",
-      "Finds the text in each image, translates it and draws the translation in place.",
-      "Writes DIR/NAME.png (translated), DIR/NAME.compare.png (before | after), DIR/NAME.json.", "",
+      "usage: translate.sh photo IMAGE... --from LANG --to LANG --out DIR [options]",
+      "       translate.sh video VIDEO_OR_FRAME_FOLDER --from LANG --to LANG --out DIR [--live]",
+      "", "Finds the text, translates it and draws the translation in place. photo writes",
+      "DIR/NAME.png (translated), DIR/NAME.compare.png (before | after) and DIR/NAME.json;",
+      "video writes DIR/NAME.mp4 (or .avi), DIR/NAME.preview.gif and DIR/NAME.json.", "",
       "  --from LANG          language of the text in the images (ISO 639-1, default en)",
       "  --to LANG            language to translate into (ISO 639-1, default es)",
       "  --out DIR            output directory (default out), created when missing",
