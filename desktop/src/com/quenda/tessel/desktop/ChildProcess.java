@@ -38,10 +38,12 @@ public final class ChildProcess {
 
   /**
    * Runs {@code command} with {@code input} on its standard input (UTF-8) and the extra
-   * environment variables; throws IOException when it cannot be started (not installed).
+   * environment variables; throws IOException when it cannot be started (not installed), and
+   * CHILD_FAILED naming the {@code role} of the program ("OCR", "translation") when it has not
+   * finished after {@code timeoutMillis}.
    */
-  public static Result run(List<String> command, String input, Map<String, String> environment,
-      long timeoutSeconds) throws IOException, HostException {
+  public static Result run(String role, List<String> command, String input,
+      Map<String, String> environment, long timeoutMillis) throws IOException, HostException {
     ProcessBuilder builder = new ProcessBuilder(command);
     builder.environment().putAll(environment);
     Process process = builder.start();
@@ -56,11 +58,12 @@ public final class ChildProcess {
       // The child closed its input early; its exit status and error output tell why.
     }
     try {
-      if (!process.waitFor(timeoutSeconds, TimeUnit.SECONDS)) {
+      if (!process.waitFor(timeoutMillis, TimeUnit.MILLISECONDS)) {
         process.destroyForcibly();
         process.waitFor();
         throw new HostException(ExitStatus.CHILD_FAILED,
-            command.get(0) + " did not finish within " + timeoutSeconds + " s");
+            String.format("the %s program '%s' did not finish within %d ms and was stopped", role,
+                command.get(0), timeoutMillis));
       }
       outReader.join();
       errReader.join();

@@ -46,17 +46,15 @@ public final class OverlayDrawer implements AutoCloseable {
   }
 
   /**
-   * Draws {@code rgb} with, for each line i, its patch at {@code patchRects} and {@code texts[i]}
-   * fitted into {@code textRects} in {@code colors[i]}; returns the drawn frame, RGB.
+   * Draws {@code rgba} (the camera frame, 8-bit RGBA as the renderer takes it) with, for each line
+   * i, its patch at {@code patchRects} and {@code texts[i]} fitted into {@code textRects} in
+   * {@code colors[i]}; returns the drawn frame, RGB.
    */
-  public Mat draw(Mat rgb, Overlays overlays) {
-    Mat rgba = new Mat();
-    Imgproc.cvtColor(rgb, rgba, Imgproc.COLOR_RGB2RGBA);
+  public Mat draw(Mat rgba, Overlays overlays) {
     int n = overlays.texts.length;
     VexelJNI.renderOneFrame(rgba.getNativeObjAddr(), overlays.texts, overlays.patchRects,
         overlays.textRects, overlays.ids, overlays.patchAddresses, overlays.colorScales,
         new double[3 * n], overlays.colors);
-    rgba.release();
     return readBack();
   }
 

@@ -16,6 +16,7 @@ import java.util.ArrayList;
 import java.util.List;
 import org.opencv.core.Mat;
 import org.opencv.core.RotatedRect;
+import org.opencv.imgproc.Imgproc;
 
 /**
  * Translates one photo in place, in the order a phone host works on a frame: read the text lines
@@ -92,7 +93,11 @@ public final class PhotoJob {
         Rects.pack(textRects), ids, patches.addresses(), patches.colors, null);
     try (OverlayDrawer drawer = new OverlayDrawer(rgb.cols(), rgb.rows())) {
       drawer.setLanguage(target, FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects(shown))));
-      return drawer.draw(rgb, overlays);
+      Mat rgba = new Mat();
+      Imgproc.cvtColor(rgb, rgba, Imgproc.COLOR_RGB2RGBA);
+      Mat drawn = drawer.draw(rgba, overlays);
+      rgba.release();
+      return drawn;
     }
   }
 

@@ -20,7 +20,7 @@ import java.util.Map;
  * every word was unknown counts as not translated.
  */
 public final class ApertiumTranslator implements Translator {
-  private static final long TIMEOUT_SECONDS = 120;
+  private static final long TIMEOUT_MILLIS = 120_000;
 
   private final String mode;
 
@@ -61,7 +61,8 @@ public final class ApertiumTranslator implements Translator {
   private String run(String text) throws HostException {
     ChildProcess.Result result;
     try {
-      result = ChildProcess.run(List.of("apertium", mode), text, Map.of(), TIMEOUT_SECONDS);
+      result = ChildProcess.run(
+          "translation", List.of("apertium", mode), text, Map.of(), TIMEOUT_MILLIS);
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "cannot run apertium: install the Debian package apertium");
@@ -76,7 +77,8 @@ public final class ApertiumTranslator implements Translator {
   private static List<String> installedModes(Language from, Language to) throws HostException {
     ChildProcess.Result result;
     try {
-      result = ChildProcess.run(List.of("apertium", "-l"), "", Map.of(), TIMEOUT_SECONDS);
+      result =
+          ChildProcess.run("translation", List.of("apertium", "-l"), "", Map.of(), TIMEOUT_MILLIS);
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "Apertium is not installed: install the Debian packages apertium and "

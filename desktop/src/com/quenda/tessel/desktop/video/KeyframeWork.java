@@ -30,7 +30,12 @@ final class KeyframeWork {
    */
   record Result(int frame, List<RecognizedLine> lines, List<String> translations,
       Eraser.Patches patches, double[] means, double ocrMillis, double translateMillis,
-      double eraseMillis, FontChoice.Weight weight) {}
+      double eraseMillis, FontChoice.Weight weight) {
+    /** Where the translated lines were read: what is erased, tracked and drawn. */
+    List<RotatedRect> translatedRects() {
+      return KeyframeWork.translatedRects(lines, translations);
+    }
+  }
 
   private final PhotoReader reader;
   private final Translator translator;
@@ -54,12 +59,7 @@ final class KeyframeWork {
     List<String> translations = translate(lines);
     long translatedAt = System.nanoTime();
 
-    List<RotatedRect> rects = new ArrayList<>();
-    for (int i = 0; i < lines.size(); i++) {
-      if (translations.get(i) != null) {
-        rects.add(lines.get(i).rect);
-      }
-    }
+    List<RotatedRect> rects = translatedRects(lines, translations);
     Eraser.Patches patches = Eraser.erase(rgb, rects);
     double[] means = FrameMeans.under(rgb, patches.patchRects);
     long end = System.nanoTime();
@@ -84,6 +84,17 @@ final class KeyframeWork {
       translations.add(translated.get(key(line.text)));
     }
     return translations;
+  }
+
+  private static List<RotatedRect> translatedRects(
+      List<RecognizedLine> lines, List<String> translations) {
+    List<RotatedRect> rects = new ArrayList<>();
+    for (int i = 0; i < lines.size(); i++) {
+      if (translations.get(i) != null) {
+        rects.add(lines.get(i).rect);
+      }
+    }
+    return rects;
   }
 
   static String key(String text) {

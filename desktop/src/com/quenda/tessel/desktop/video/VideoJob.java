@@ -56,8 +56,19 @@ public final class VideoJob {
   // than that is dropped and a new keyframe taken.
   private static final int MAX_CATCH_UP_FRAMES = 240;
 
-  /** A live keyframe's result with its tracker, run through the frames queued meanwhile. */
-  private record CaughtUp(KeyframeWork.Result result, long tracker, double[] rects) {}
+  /**
+   * A live keyframe's result with its tracker, run through the frames queued meanwhile (taking
+   * {@code catchUpMillis} on the worker).
+   */
+  private record CaughtUp(
+      KeyframeWork.Result result, long tracker, double[] rects, double catchUpMillis) {
+    void release() {
+      result.patches().release();
+      if (tracker != 0) {
+        TrackingJNI.releaseTracker(tracker);
+      }
+    }
+  }
 
   private final KeyframeWork work;
   private final Language target;
@@ -102,10 +113,14 @@ public final class VideoJob {
     private boolean fontChosen;
     private List<Object> gainsKey;
     private double[] gainsValue;
+    private final Mat rgbaFrame = new Mat();
+    private Mat rgbaOf;
 
     // Live: the keyframe being worked on, the reason it was taken, and the frames since.
     private Future<CaughtUp> pending;
     private String pendingReason;
+    private boolean pendingStale;
+    private boolean retakeKeyframe;
     private BlockingQueue<Mat> catchUp = new LinkedBlockingQueue<>();
     private long startNanos;
 
@@ -155,7 +170,7 @@ public final class VideoJob {
       String reason = keyframeReason(frame, k, lostAll);
       if (reason != null) {
         takeKeyframe(frame, k, reason);
-      } else if (pending != null) {
+      } else if (pending != null && !pendingStale) {
         catchUp.add(frame.clone());
       }
       if (!live) {
@@ -207,6 +222,10 @@ public final class VideoJob {
       if (lastKeyframe == Integer.MIN_VALUE) {
         return "first frame";
       }
+      if (retakeKeyframe) {
+        retakeKeyframe = false;
+        return "last keyframe's result came too late";
+      }
       if (shown.isEmpty()) {
         return k - lastKeyframe >= KeyframeRules.RETRY_FRAMES ? "no text on screen" : null;
       }
@@ -227,12 +246,20 @@ public final class VideoJob {
     }
 
     private double frameAccuracy(Mat frame) {
-      Mat rgba = new Mat();
-      Imgproc.cvtColor(frame, rgba, Imgproc.COLOR_RGB2RGBA);
-      double accuracy = TrackingJNI.calculateFrameAccuracy(
-          keyframeRgba.getNativeObjAddr(), rgba.getNativeObjAddr());
-      rgba.release();
-      return accuracy;
+      return TrackingJNI.calculateFrameAccuracy(
+          keyframeRgba.getNativeObjAddr(), rgba(frame).getNativeObjAddr());
+    }
+
+    /**
+     * The frame as RGBA, as the renderer and the frame-accuracy measure take it: converted once a
+     * frame, into the same buffer every time.
+     */
+    private Mat rgba(Mat frame) {
+      if (rgbaOf != frame) {
+        Imgproc.cvtColor(frame, rgbaFrame, Imgproc.COLOR_RGB2RGBA);
+        rgbaOf = frame;
+      }
+      return rgbaFrame;
     }
 
     private void takeKeyframe(Mat frame, int k, String reason) throws HostException {
@@ -270,8 +297,7 @@ public final class VideoJob {
         }
         later.release();
       }
-      timings.add("catch-up on the worker", (System.nanoTime() - start) / 1e6);
-      return new CaughtUp(result, tracker, rects);
+      return new CaughtUp(result, tracker, rects, (System.nanoTime() - start) / 1e6);
     }
 
     /** Live: takes a finished keyframe and brings its rectangles to this frame. */
@@ -281,15 +307,22 @@ public final class VideoJob {
       }
       if (!pending.isDone()) {
         if (catchUp.size() > MAX_CATCH_UP_FRAMES) {
-          pending.cancel(true);
-          pending = null;
+          // Too late to catch up with: stop queueing, drop its result when it comes.
+          pendingStale = true;
           releaseCatchUp();
-          lastKeyframe = Integer.MIN_VALUE;
         }
         return;
       }
       CaughtUp caughtUp = result(pending);
       pending = null;
+      if (pendingStale) {
+        pendingStale = false;
+        caughtUp.release();
+        releaseCatchUp();
+        retakeKeyframe = true;
+        return;
+      }
+      timings.add("catch-up on the worker", caughtUp.catchUpMillis());
       long start = System.nanoTime();
       double[] rects = caughtUp.rects();
       for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
@@ -343,19 +376,13 @@ public final class VideoJob {
         keyframeRgba.release();
       }
       // The reference for the view-change rule: the view the overlays were placed in.
-      keyframeRgba = new Mat();
-      Imgproc.cvtColor(frame, keyframeRgba, Imgproc.COLOR_RGB2RGBA);
+      keyframeRgba = rgba(frame).clone();
       chooseFont(frame, result.weight());
     }
 
     /** A tracker of the result's translated lines on the frame they were read in; 0 for none. */
     private long startTracker(Mat keyframe, KeyframeWork.Result result) {
-      List<RotatedRect> rects = new ArrayList<>();
-      for (int i = 0; i < result.lines().size(); i++) {
-        if (result.translations().get(i) != null) {
-          rects.add(result.lines().get(i).rect);
-        }
-      }
+      List<RotatedRect> rects = result.translatedRects();
       return rects.isEmpty()
           ? 0
           : TrackingJNI.initializeTracker(keyframe.getNativeObjAddr(), Rects.pack(rects));
@@ -475,7 +502,7 @@ public final class VideoJob {
         colors[i] = line.color;
         textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));
       }
-      Mat drawn = drawer(frame).draw(frame,
+      Mat drawn = drawer(frame).draw(rgba(frame),
           new Overlays(texts, patchRects(visible), Rects.pack(textRects), ids, patches, colors,
               gains(frame, visible)));
       timings.add("draw", (System.nanoTime() - start) / 1e6);
@@ -555,11 +582,7 @@ public final class VideoJob {
         worker.shutdownNow();
         try {
           if (pending != null) {
-            CaughtUp late = pending.get();
-            late.result().patches().release();
-            if (late.tracker() != 0) {
-              TrackingJNI.releaseTracker(late.tracker());
-            }
+            pending.get().release();
           }
         } catch (InterruptedException | ExecutionException | RuntimeException e) {
           // The worker failed or was stopped; it holds nothing more to free.
@@ -573,6 +596,7 @@ public final class VideoJob {
       if (keyframeRgba != null) {
         keyframeRgba.release();
       }
+      rgbaFrame.release();
       if (drawer != null) {
         drawer.close();
       }

@@ -6,6 +6,7 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.desktop.CommandLine;
 import com.quenda.tessel.desktop.Language;
+import com.quenda.tessel.desktop.TranslateMain;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.scenes.CameraSequence;
 import com.quenda.tessel.desktop.scenes.CameraSequence.Pose;
@@ -26,6 +27,8 @@ import org.opencv.core.Core;
 import org.opencv.core.Mat;
 import org.opencv.core.Point;
 import org.opencv.core.Size;
+import org.opencv.imgcodecs.Imgcodecs;
+import org.opencv.imgproc.Imgproc;
 
 /**
  * The host loop on a generated 120-frame camera sequence with known motion: the camera moves over
@@ -185,17 +188,17 @@ class VideoLoopTest {
     Path empty = Files.createDirectories(dir.resolve("no-frames"));
     assertRefused(empty, 67, empty + ": no frames (no images in it)");
     Path mixed = Files.createDirectories(dir.resolve("mixed"));
-    org.opencv.imgcodecs.Imgcodecs.imwrite(mixed.resolve("f1.png").toString(), sequence.frame(0));
+    Imgcodecs.imwrite(mixed.resolve("f1.png").toString(), sequence.frame(0));
     Mat small = new Mat();
-    org.opencv.imgproc.Imgproc.resize(sequence.frame(1), small, new Size(640, 360));
-    org.opencv.imgcodecs.Imgcodecs.imwrite(mixed.resolve("f2.png").toString(), small);
+    Imgproc.resize(sequence.frame(1), small, new Size(640, 360));
+    Imgcodecs.imwrite(mixed.resolve("f2.png").toString(), small);
     assertRefused(mixed, 65, mixed + ": frame 1 is 640x360, the first was 1280x720");
   }
 
   static void assertRefused(Path input, int status, String message) throws Exception {
     Path out = Files.createTempDirectory(dir, "refused");
     ByteArrayOutputStream err = new ByteArrayOutputStream();
-    int code = com.quenda.tessel.desktop.TranslateMain
+    int code = TranslateMain
                    .run(new String[] {"video", input.toString(), "--out", out.toString()},
                        new PrintStream(new ByteArrayOutputStream(), true, StandardCharsets.UTF_8),
                        new PrintStream(err, true, StandardCharsets.UTF_8))
