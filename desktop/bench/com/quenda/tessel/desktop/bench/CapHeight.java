@@ -1,5 +1,6 @@
 package com.quenda.tessel.desktop.bench;
 
+import com.quenda.tessel.desktop.Upright;
 import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
@@ -61,14 +62,8 @@ final class CapHeight {
 
   private static Mat upright(Mat rgb, RotatedRect rect) {
     // A margin above and below: the drawn text may sit a little outside the OCR box.
-    double h = rect.size.height * 1.6;
-    Mat rotation = Imgproc.getRotationMatrix2D(rect.center, rect.angle, 1.0);
-    rotation.put(0, 2, rotation.get(0, 2)[0] - rect.center.x + rect.size.width / 2);
-    rotation.put(1, 2, rotation.get(1, 2)[0] - rect.center.y + h / 2);
-    Mat upright = new Mat();
-    Imgproc.warpAffine(rgb, upright, rotation, new Size(rect.size.width, h));
-    rotation.release();
-    return upright;
+    return Upright.cut(rgb, rect.center, rect.angle, 1,
+        new Size(rect.size.width, rect.size.height * 1.6), Imgproc.INTER_LINEAR);
   }
 
   private static Mat ink(Mat upright, int packed) {

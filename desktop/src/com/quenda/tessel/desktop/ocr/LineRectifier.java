@@ -1,5 +1,6 @@
 package com.quenda.tessel.desktop.ocr;
 
+import com.quenda.tessel.desktop.Upright;
 import org.opencv.core.Core;
 import org.opencv.core.Mat;
 import org.opencv.core.Rect;
@@ -46,13 +47,8 @@ final class LineRectifier {
     double margin = 0.5 * h;
     int width = (int) Math.ceil((rect.size.width + 2 * margin) * scale);
     int height = (int) Math.ceil((h + 2 * margin) * scale);
-    Mat m = Imgproc.getRotationMatrix2D(rect.center, rect.angle + (upsideDown ? 180 : 0), scale);
-    m.put(0, 2, m.get(0, 2)[0] - rect.center.x + width / 2.0);
-    m.put(1, 2, m.get(1, 2)[0] - rect.center.y + height / 2.0);
-    Mat out = new Mat();
-    Imgproc.warpAffine(
-        grey, out, m, new Size(width, height), Imgproc.INTER_CUBIC, Core.BORDER_REPLICATE);
-    m.release();
+    Mat out = Upright.cut(grey, rect.center, rect.angle + (upsideDown ? 180 : 0), scale,
+        new Size(width, height), Imgproc.INTER_CUBIC);
     if (bright) {
       Core.bitwise_not(out, out);
     }

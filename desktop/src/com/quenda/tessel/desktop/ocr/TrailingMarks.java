@@ -1,6 +1,6 @@
 package com.quenda.tessel.desktop.ocr;
 
-import org.opencv.core.Core;
+import com.quenda.tessel.desktop.Upright;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.Point;
@@ -41,13 +41,8 @@ final class TrailingMarks {
     if (reach < 2 || cols * (long) rows > 4_000_000) {
       return rect;
     }
-    Mat m = Imgproc.getRotationMatrix2D(rect.center, rect.angle, 1);
-    m.put(0, 2, m.get(0, 2)[0] - rect.center.x + cols / 2.0);
-    m.put(1, 2, m.get(1, 2)[0] - rect.center.y + rows / 2.0);
-    Mat cut = new Mat();
-    Imgproc.warpAffine(
-        grey, cut, m, new Size(cols, rows), Imgproc.INTER_LINEAR, Core.BORDER_REPLICATE);
-    m.release();
+    Mat cut =
+        Upright.cut(grey, rect.center, rect.angle, 1, new Size(cols, rows), Imgproc.INTER_LINEAR);
     Mat ink = new Mat();
     Imgproc.threshold(cut, ink, 0, 255,
         (bright ? Imgproc.THRESH_BINARY : Imgproc.THRESH_BINARY_INV) | Imgproc.THRESH_OTSU);

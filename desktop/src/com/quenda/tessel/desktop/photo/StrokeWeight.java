@@ -1,5 +1,6 @@
 package com.quenda.tessel.desktop.photo;
 
+import com.quenda.tessel.desktop.Upright;
 import java.util.ArrayList;
 import java.util.Collections;
 import java.util.List;
@@ -40,7 +41,8 @@ public final class StrokeWeight {
     if (rect.size.height < 4 || rect.size.width < 4) {
       return 0;
     }
-    Mat upright = cutUpright(rgb, rect);
+    Mat upright = Upright.cut(rgb, rect.center, rect.angle, 1,
+        new Size(Math.round(rect.size.width), Math.round(rect.size.height)), Imgproc.INTER_LINEAR);
     Mat grey = new Mat();
     Imgproc.cvtColor(upright, grey, Imgproc.COLOR_RGB2GRAY);
     Mat ink = new Mat();
@@ -61,18 +63,5 @@ public final class StrokeWeight {
     grey.release();
     ink.release();
     return border > 0 ? 2 * area / border / rect.size.height : 0;
-  }
-
-  private static Mat cutUpright(Mat rgb, RotatedRect rect) {
-    Mat rotation = Imgproc.getRotationMatrix2D(rect.center, rect.angle, 1.0);
-    // Shift the rectangle's centre to the centre of the output.
-    rotation.put(0, 2, rotation.get(0, 2)[0] - rect.center.x + rect.size.width / 2);
-    rotation.put(1, 2, rotation.get(1, 2)[0] - rect.center.y + rect.size.height / 2);
-    Mat upright = new Mat();
-    Imgproc.warpAffine(rgb, upright, rotation,
-        new Size(Math.round(rect.size.width), Math.round(rect.size.height)), Imgproc.INTER_LINEAR,
-        Core.BORDER_REPLICATE);
-    rotation.release();
-    return upright;
   }
 }
