@@ -31,6 +31,10 @@ import org.opencv.imgproc.Imgproc;
 final class LineGrouper {
   private static final double MAX_LINK_ANGLE = 40;
   private static final double MAX_REFIT_ANGLE = 20;
+  private static final double MAX_JOIN_ANGLE = 5;
+  private static final double MAX_JOIN_HEIGHT_RATIO = 1.3;
+  private static final double MAX_JOIN_OFFSET = 0.25;
+  private static final double MAX_JOIN_GAP = 1.2;
 
   List<TextLine> group(List<Component> components) {
     List<TextLine> lines = new ArrayList<>();
@@ -45,7 +49,58 @@ final class LineGrouper {
         }
       }
     }
-    return dropOverlaps(lines);
+    return dropOverlaps(joinFragments(lines));
+  }
+
+  /**
+   * Joins the pieces of one line that the links left apart: between two words of only x-height
+   * letters the gap can be wider than 0.9 of their height ("at the  counter"), though narrow for
+   * the line as a whole. Two lines of one polarity are one when they run in the same direction
+   * (within 5°), are as tall (within a factor 1.3), lie on one centreline (off by under a quarter
+   * of the height) and their ends are less than 1.2 line heights apart. Lines of a page, one above
+   * the other, are a whole height off each other's centreline.
+   */
+  private static List<TextLine> joinFragments(List<TextLine> lines) {
+    List<TextLine> out = new ArrayList<>(lines);
+    for (boolean joined = true; joined;) {
+      joined = false;
+      for (int i = 0; i < out.size() && !joined; i++) {
+        for (int j = i + 1; j < out.size() && !joined; j++) {
+          TextLine both = joined(out.get(i), out.get(j));
+          if (both != null) {
+            out.set(i, both);
+            out.remove(j);
+            joined = true;
+          }
+        }
+      }
+    }
+    return out;
+  }
+
+  private static TextLine joined(TextLine a, TextLine b) {
+    if (a.bright != b.bright
+        || Math.abs(InkRect.fold(a.rect.angle - b.rect.angle)) > MAX_JOIN_ANGLE) {
+      return null;
+    }
+    double ha = a.rect.size.height;
+    double hb = b.rect.size.height;
+    double h = Math.max(ha, hb);
+    if (h > MAX_JOIN_HEIGHT_RATIO * Math.min(ha, hb)) {
+      return null;
+    }
+    double radians = Math.toRadians(a.rect.angle);
+    double dx = b.rect.center.x - a.rect.center.x;
+    double dy = b.rect.center.y - a.rect.center.y;
+    double along = dx * Math.cos(radians) + dy * Math.sin(radians);
+    double across = -dx * Math.sin(radians) + dy * Math.cos(radians);
+    double gap = Math.abs(along) - (a.rect.size.width + b.rect.size.width) / 2;
+    if (Math.abs(across) > MAX_JOIN_OFFSET * h || gap > MAX_JOIN_GAP * h) {
+      return null;
+    }
+    List<Component> parts = new ArrayList<>(a.parts);
+    parts.addAll(b.parts);
+    return line(parts, fitDirection(parts), a.bright);
   }
 
   /** The candidates of one polarity, left to right: lines are built from one polarity only. */

@@ -8,9 +8,15 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.scenes.Backdrop;
+import com.quenda.tessel.desktop.scenes.Fonts;
 import com.quenda.tessel.desktop.scenes.Scene;
 import com.quenda.tessel.desktop.scenes.Scenes;
 import com.quenda.tessel.desktop.scenes.SignScene;
+import java.awt.Color;
+import java.awt.Graphics2D;
+import java.awt.RenderingHints;
+import java.awt.image.BufferedImage;
+import java.awt.image.DataBufferByte;
 import java.io.IOException;
 import java.nio.file.Files;
 import java.nio.file.Path;
@@ -21,6 +27,7 @@ import org.junit.jupiter.api.io.TempDir;
 import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
+import org.opencv.imgproc.Imgproc;
 
 /** The reader against generated scenes whose text and rectangles are known, with real OCR. */
 class PhotoReaderTest {
@@ -52,6 +59,29 @@ class PhotoReaderTest {
       scene.release();
     }
     assertTrue(found >= 0.9 * words, found + " of " + words + " words found");
+  }
+
+  @Test
+  void keepsALineWithWideWordSpacesBetweenShortLettersWhole() throws HostException {
+    // Sharp, as a screenshot: between "the" and "counter" the space is wider than 0.9 of the
+    // x-height, which used to cut the line in two.
+    BufferedImage picture = new BufferedImage(900, 200, BufferedImage.TYPE_3BYTE_BGR);
+    Graphics2D g = picture.createGraphics();
+    g.setColor(Color.WHITE);
+    g.fillRect(0, 0, 900, 200);
+    g.setColor(Color.DARK_GRAY);
+    g.setRenderingHint(
+        RenderingHints.KEY_TEXT_ANTIALIASING, RenderingHints.VALUE_TEXT_ANTIALIAS_ON);
+    g.setFont(Fonts.SANS.deriveFont(40f));
+    g.drawString("Tickets are sold at the counter", 60, 110);
+    g.dispose();
+    Mat rgb = new Mat(200, 900, CvType.CV_8UC3);
+    rgb.put(0, 0, ((DataBufferByte) picture.getRaster().getDataBuffer()).getData());
+    Imgproc.cvtColor(rgb, rgb, Imgproc.COLOR_BGR2RGB);
+    List<RecognizedLine> lines = reader.read(rgb);
+    assertEquals(1, lines.size(), "lines: " + lines);
+    assertEquals("Tickets are sold at the counter", lines.get(0).text);
+    rgb.release();
   }
 
   @Test
