@@ -74,7 +74,7 @@ public final class PhotoReader implements AutoCloseable {
     Mat grey = new Mat();
     Imgproc.cvtColor(rgb, grey, Imgproc.COLOR_RGB2GRAY);
     try {
-      return sorted(readGrey(grey, true));
+      return sorted(wholeLines(readGrey(grey, true), rgb.size()));
     } finally {
       grey.release();
     }
@@ -82,6 +82,27 @@ public final class PhotoReader implements AutoCloseable {
 
   @Override
   public void close() {}
+
+  /**
+   * Without the lines that run off the picture: where a line's rectangle reaches past the edge its
+   * text is cut, and what is left in view ("ts sold he") is neither the sign's text nor anything
+   * to translate.
+   */
+  private static List<RecognizedLine> wholeLines(List<RecognizedLine> lines, Size picture) {
+    List<RecognizedLine> whole = new ArrayList<>();
+    Point[] corners = new Point[4];
+    for (RecognizedLine line : lines) {
+      line.rect.points(corners);
+      boolean cut = false;
+      for (Point p : corners) {
+        cut |= p.x < 0 || p.y < 0 || p.x > picture.width || p.y > picture.height;
+      }
+      if (!cut) {
+        whole.add(line);
+      }
+    }
+    return whole;
+  }
 
   private List<RecognizedLine> readGrey(Mat grey, boolean mayTurn) throws HostException {
     double f = Math.min(1.0, DETECTION_SIZE / (double) Math.max(grey.cols(), grey.rows()));

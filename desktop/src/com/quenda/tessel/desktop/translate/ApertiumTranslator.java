@@ -8,6 +8,7 @@ import java.io.IOException;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.Map;
+import java.util.regex.Pattern;
 
 /**
  * Translation by the apertium program, all lines of an image in one run.
@@ -21,6 +22,9 @@ import java.util.Map;
  */
 public final class ApertiumTranslator implements Translator {
   private static final long TIMEOUT_MILLIS = 120_000;
+  private static final Pattern MARK = Pattern.compile("(?<![\\p{L}\\p{N}])[*#@](?=[\\p{L}\\p{N}])");
+  private static final Pattern UNKNOWN =
+      Pattern.compile("(?<![\\p{L}\\p{N}])\\*(?=[\\p{L}\\p{N}])");
 
   private final String mode;
 
@@ -111,24 +115,20 @@ public final class ApertiumTranslator implements Translator {
 
   /** The paragraph without Apertium's marks; null when no word of it was known. */
   static String unmarked(String paragraph) {
-    String[] words = paragraph.split(" ");
     int known = 0;
     StringBuilder text = new StringBuilder();
-    for (String word : words) {
+    for (String word : paragraph.split(" ")) {
       if (word.isEmpty()) {
         continue;
       }
-      char first = word.charAt(0);
-      boolean marked = (first == '*' || first == '#' || first == '@') && word.length() > 1;
-      if (first != '*' && hasLetterOrDigit(word)) {
+      // A mark stands before the word's letters, after any punctuation glued to it ("(*word").
+      String plain = MARK.matcher(word).replaceAll("");
+      if (!UNKNOWN.matcher(word).find()
+          && plain.codePoints().anyMatch(Character::isLetterOrDigit)) {
         ++known;
       }
-      text.append(text.length() == 0 ? "" : " ").append(marked ? word.substring(1) : word);
+      text.append(text.length() == 0 ? "" : " ").append(plain);
     }
     return known == 0 ? null : text.toString();
-  }
-
-  private static boolean hasLetterOrDigit(String word) {
-    return word.codePoints().anyMatch(Character::isLetterOrDigit);
   }
 }
