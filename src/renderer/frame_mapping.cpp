@@ -1,6 +1,7 @@
 #include "renderer/frame_mapping.h"
 
 #include <cmath>
+
 #include <opencv2/core.hpp>
 #include <opencv2/imgproc.hpp>
 
@@ -151,11 +152,17 @@ ImageRect OrientRect(const ImageRect& rect, int orientation, double bg_width, do
 }
 
 double NormalizeDegrees(double angle) {
-  while (angle < 0.0)
-    angle += 360.0;
-  while (angle >= 360.0)
-    angle -= 360.0;
-  return angle;
+  // The same value as stepping by 360 until the angle lies in [0, 360): the
+  // remainder is exact, and so is every step of that walk for any angle it
+  // finishes on. Unlike the walk, it ends for huge and infinite angles; a
+  // non-finite angle gives NaN, which is neither upright nor in range.
+  double reduced = std::fmod(angle, 360.0);
+  if (reduced < 0.0)
+    reduced += 360.0;
+  // A tiny negative remainder rounds up to 360 when shifted.
+  if (reduced >= 360.0)
+    reduced -= 360.0;
+  return reduced;
 }
 
 bool IsUpright(double angle) {

@@ -115,7 +115,7 @@ TextRecord UnreadableTextRecord();
 // it is.
 ImageRect OrientRect(const ImageRect& rect, int orientation, double bg_width, double bg_height);
 
-// The angle in [0, 360).
+// The angle in [0, 360); NaN for a non-finite angle.
 double NormalizeDegrees(double angle);
 
 // Whether a rectangle at this angle stands upright on screen, so that its

@@ -2,6 +2,8 @@
 // colour correction, and the mapping of image rectangles into camera space.
 #include <gtest/gtest.h>
 
+#include <cmath>
+#include <cstring>
 #include <limits>
 #include <opencv2/core.hpp>
 #include <vector>
@@ -142,6 +144,35 @@ TEST(AngleRule, UprightBetween45And135Or225And315BoundsIncluded) {
   EXPECT_DOUBLE_EQ(NormalizeDegrees(-30.0), 330.0);
   EXPECT_DOUBLE_EQ(NormalizeDegrees(-720.0), 0.0);
   EXPECT_DOUBLE_EQ(NormalizeDegrees(765.0), 45.0);
+}
+
+// The walk by 360 that the rule describes, kept here to compare against.
+double WalkIntoRange(double angle) {
+  while (angle < 0.0)
+    angle += 360.0;
+  while (angle >= 360.0)
+    angle -= 360.0;
+  return angle;
+}
+
+TEST(AngleRule, SameBitsAsTheWalkAndEndsForHugeAndNonFiniteAngles) {
+  cv::RNG rng(7);
+  for (int i = 0; i < 20000; ++i) {
+    const double magnitude = std::pow(10.0, rng.uniform(-12.0, 6.0));
+    const double angle = rng.uniform(0, 2) == 0 ? magnitude : -magnitude;
+    const double walked = WalkIntoRange(angle);
+    const double reduced = NormalizeDegrees(angle);
+    EXPECT_EQ(std::memcmp(&walked, &reduced, sizeof walked), 0) << angle;
+  }
+  // A tiny negative angle rounds to 360 on the way in; the walk then lands on 0.
+  EXPECT_EQ(NormalizeDegrees(-1e-20), 0.0);
+  const double inf = std::numeric_limits<double>::infinity();
+  for (double angle : {1e300, -1e300, 1e17})
+    EXPECT_TRUE(NormalizeDegrees(angle) >= 0.0 && NormalizeDegrees(angle) < 360.0) << angle;
+  for (double angle : {inf, -inf, std::numeric_limits<double>::quiet_NaN()}) {
+    EXPECT_TRUE(std::isnan(NormalizeDegrees(angle)));
+    EXPECT_FALSE(IsUpright(angle));  // counts as lying
+  }
 }
 
 CameraView View(float camera_w, float camera_h, float image_w, float image_h) {
