@@ -7,7 +7,9 @@
 // the image writer is bound; AnswerInpaintingRequest
 // (inpainting/driver/inpainting_request.cpp) runs the pipeline, checks its
 // answer, assigns the overlays and packs the colours; back here the packed
-// colours are written into the host's array.
+// colours are written into the host's array. An OpenCV error in the pipeline
+// is not handled by the engine; it leaves the native call as a Java
+// exception.
 #include <jni.h>
 
 #include <cstdint>
@@ -20,11 +22,13 @@
 #include "inpainting/driver/color_statistics.h"
 #include "inpainting/driver/inpainting_request.h"
 #include "jni/host_mat.h"
+#include "jni/java_exceptions.h"
 #include "jni/jni_arrays.h"
 
 namespace {
 
 using ocr::jni::ArrayElements;
+using ocr::jni::CallPassingExceptionsToJava;
 using ocr::jni::OnRelease;
 
 // The host's input image; an address of 0 reads as an empty matrix, which
@@ -39,13 +43,8 @@ size_t LengthOf(JNIEnv* env, jarray array) {
   return array != nullptr ? static_cast<size_t>(env->GetArrayLength(array)) : 0;
 }
 
-}  // namespace
-
-extern "C" {
-
-JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_InpaintingRotRectImg(
-    JNIEnv* env, jclass, jlong image_address, jlongArray output_addresses, jdoubleArray rects,
-    jintArray font_colors) {
+jint InpaintingRotRectImg(JNIEnv* env, jlong image_address, jlongArray output_addresses,
+                          jdoubleArray rects, jintArray font_colors) {
   OCR_LOGI("Inpainting_Process: Start JNI");
   if (rects == nullptr) {
     OCR_LOGE(" Inpainting_Process: No rectangles passed for inpainting in Java call");
@@ -103,9 +102,8 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Inpaintin
   return 0;
 }
 
-JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_CalculateMeansStdDevs(
-    JNIEnv* env, jclass, jlong image_address, jdoubleArray rects, jdoubleArray means,
-    jdoubleArray std_devs) {
+jint CalculateMeansStdDevs(JNIEnv* env, jlong image_address, jdoubleArray rects, jdoubleArray means,
+                           jdoubleArray std_devs) {
   // The rectangles are only read; the means and deviations go back to the
   // host unless the call fails.
   ArrayElements<jdoubleArray> rect_values(env, rects, OnRelease::kDiscard);
@@ -125,6 +123,26 @@ JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_Calculate
     std_dev_values.Discard();
   }
   return status;
+}
+
+}  // namespace
+
+extern "C" {
+
+JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_InpaintingRotRectImg(
+    JNIEnv* env, jclass, jlong image_address, jlongArray output_addresses, jdoubleArray rects,
+    jintArray font_colors) {
+  return CallPassingExceptionsToJava(env, jint{0}, [&] {
+    return InpaintingRotRectImg(env, image_address, output_addresses, rects, font_colors);
+  });
+}
+
+JNIEXPORT jint JNICALL Java_com_quenda_tessel_inpainting_InpaintingJNI_CalculateMeansStdDevs(
+    JNIEnv* env, jclass, jlong image_address, jdoubleArray rects, jdoubleArray means,
+    jdoubleArray std_devs) {
+  return CallPassingExceptionsToJava(env, jint{0}, [&] {
+    return CalculateMeansStdDevs(env, image_address, rects, means, std_devs);
+  });
 }
 
 }  // extern "C"

@@ -1,16 +1,19 @@
 // Bridge of com.quenda.tessel.tracking.TrackingJNI: one rotated-rectangle
-// tracker per handle, the frame accuracy and the blur measure. Glue only; no
-// exception is caught here, so an OpenCV error leaves the native call.
+// tracker per handle, the frame accuracy and the blur measure. Glue only; an
+// OpenCV error is not handled by the engine but leaves the native call as a
+// Java exception.
 #include <jni.h>
 
 #include <cmath>
 #include <cstdint>
+#include <memory>
 #include <vector>
 
 #include <opencv2/core.hpp>
 
 #include "common/log.h"
 #include "jni/host_mat.h"
+#include "jni/java_exceptions.h"
 #include "jni/jni_arrays.h"
 #include "quality/blur_measure.h"
 #include "tracking/frame_accuracy.h"
@@ -18,6 +21,8 @@
 #include "tracking/tracker_release.h"
 
 namespace {
+
+using ocr::jni::CallPassingExceptionsToJava;
 
 // Centre x, centre y, width, height, angle (degrees) per rectangle.
 constexpr jsize kValsPerRect = 5;
@@ -80,19 +85,24 @@ JNIEXPORT jlong JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_initializeTr
     JNIEnv* env, jclass, jlong mat_addr, jdoubleArray rects) {
   if (mat_addr == 0)
     return 0;
-  const std::vector<cv::RotatedRect> start_rects = ReadRects(env, rects);
-  auto* tracker = new zeph::OcrTrackerRotRect();
-  tracker->StartTracker(ocr::jni::HostMat(mat_addr), start_rects);
-  return HandleOf(tracker);
+  return CallPassingExceptionsToJava(env, jlong{0}, [&] {
+    const std::vector<cv::RotatedRect> start_rects = ReadRects(env, rects);
+    // The host gets a handle only once the tracker has started.
+    auto tracker = std::make_unique<zeph::OcrTrackerRotRect>();
+    tracker->StartTracker(ocr::jni::HostMat(mat_addr), start_rects);
+    return HandleOf(tracker.release());
+  });
 }
 
 JNIEXPORT jdoubleArray JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_updateTracker(
     JNIEnv* env, jclass, jlong handle, jlong mat_addr) {
   if (handle == 0 || mat_addr == 0)
     return nullptr;
-  std::vector<cv::RotatedRect> rects;
-  TrackerFromHandle(handle)->UpdateTracker(ocr::jni::HostMat(mat_addr), &rects);
-  return WriteRects(env, rects);
+  return CallPassingExceptionsToJava(env, jdoubleArray{nullptr}, [&] {
+    std::vector<cv::RotatedRect> rects;
+    TrackerFromHandle(handle)->UpdateTracker(ocr::jni::HostMat(mat_addr), &rects);
+    return WriteRects(env, rects);
+  });
 }
 
 JNIEXPORT jdouble JNICALL
@@ -111,14 +121,17 @@ JNIEXPORT void JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_releaseTracke
 }
 
 JNIEXPORT jdouble JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_calculateFrameAccuracy(
-    JNIEnv*, jclass, jlong first_addr, jlong second_addr) {
-  return zeph::CalculateFrameAccuracy(ocr::jni::HostMat(first_addr),
-                                      ocr::jni::HostMat(second_addr));
+    JNIEnv* env, jclass, jlong first_addr, jlong second_addr) {
+  return CallPassingExceptionsToJava(env, jdouble{0.0}, [&] {
+    return zeph::CalculateFrameAccuracy(ocr::jni::HostMat(first_addr),
+                                        ocr::jni::HostMat(second_addr));
+  });
 }
 
 JNIEXPORT jdouble JNICALL
-Java_com_quenda_tessel_tracking_TrackingJNI_calculateBlur(JNIEnv*, jclass, jlong mat_addr) {
-  return image_quality::CalculateBlur(ocr::jni::HostMat(mat_addr));
+Java_com_quenda_tessel_tracking_TrackingJNI_calculateBlur(JNIEnv* env, jclass, jlong mat_addr) {
+  return CallPassingExceptionsToJava(
+      env, jdouble{0.0}, [&] { return image_quality::CalculateBlur(ocr::jni::HostMat(mat_addr)); });
 }
 
 }  // extern "C"

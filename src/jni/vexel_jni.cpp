@@ -1,5 +1,8 @@
 // Bridge of org.vexel.android.VexelJNI: the overlay renderer's entry points.
-// Glue only; the work is in renderer/renderer_bridge.
+// Glue only; the work is in renderer/renderer_bridge, which catches and logs
+// whatever a scene call throws. What is left (running out of memory while
+// copying the host's strings and records) reaches the host as a Java
+// exception rather than ending its process.
 #include <android/asset_manager_jni.h>
 #include <android/native_window_jni.h>
 #include <jni.h>
@@ -11,12 +14,14 @@
 #include "common/log.h"
 #include "common/modified_utf8.h"
 #include "jni/host_mat.h"
+#include "jni/java_exceptions.h"
 #include "jni/jni_arrays.h"
 #include "renderer/renderer_bridge.h"
 
 namespace {
 
 using ocr::jni::ArrayElements;
+using ocr::jni::CallPassingExceptionsToJava;
 using ocr::jni::OnRelease;
 using ocr::jni::UtfChars;
 
@@ -74,7 +79,7 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_setTranslationLanguage(JN
     OCR_LOGE("Vexel: set translation language failed to GetStringUTFChars.");
     return;
   }
-  ocr_ar::bridge::SetTranslationLanguage(chars.c_str());
+  CallPassingExceptionsToJava(env, [&] { ocr_ar::bridge::SetTranslationLanguage(chars.c_str()); });
 }
 
 JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_setTranslationLanguageFont(
@@ -85,7 +90,9 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_setTranslationLanguageFon
     return;
   }
   UtfChars path_chars(env, fontPath);
-  ocr_ar::bridge::SetTranslationLanguageFont(language_chars.c_str(), path_chars.c_str());
+  CallPassingExceptionsToJava(env, [&] {
+    ocr_ar::bridge::SetTranslationLanguageFont(language_chars.c_str(), path_chars.c_str());
+  });
 }
 
 JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_renderOneFrame(
@@ -113,8 +120,10 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_renderOneFrame(
   arrays.color_scales = View<double>(scales);
   arrays.color_shifts = View<double>(shifts);
   arrays.colors = View<std::int32_t>(colour_values);
-  ocr_ar::bridge::RenderOneFrame(
-      image, text_count, [env, texts](std::size_t i) { return ReadText(env, texts, i); }, arrays);
+  CallPassingExceptionsToJava(env, [&] {
+    ocr_ar::bridge::RenderOneFrame(
+        image, text_count, [env, texts](std::size_t i) { return ReadText(env, texts, i); }, arrays);
+  });
 }
 
 JNIEXPORT jobject JNICALL Java_org_vexel_android_VexelJNI_GetMatByteBuffer(JNIEnv* env, jclass,

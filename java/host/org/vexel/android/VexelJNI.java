@@ -11,6 +11,12 @@ import java.nio.ByteBuffer;
  * <p>On a phone {@code assetManager} is an {@code android.content.res.AssetManager} and {@code
  * surface} an {@code android.view.Surface}; on the desktop they are an {@code
  * org.vexel.desktop.DirectoryAssetManager} and an {@code org.vexel.desktop.OffscreenSurface}.
+ *
+ * <p>A failure while drawing is logged and the frame goes on with what can still be drawn; no
+ * call throws for its inputs (angles of any value, NaN, missing or short arrays included). The
+ * one exception that can reach the caller is {@link OutOfMemoryError}, from {@link
+ * #renderOneFrame}, {@link #setTranslationLanguage} and {@link #setTranslationLanguageFont}, when
+ * native memory runs out while copying the caller's strings and records.
  */
 public final class VexelJNI {
   static {

@@ -178,6 +178,23 @@ class VexelJNITest {
   }
 
   @Test
+  void framesWithEndlessAnglesReturnAndTheNextFrameDrawsAsUsual() {
+    try (Scene scene = new Scene(160, 90, 160, 90)) {
+      NativeLog log = new NativeLog();
+      for (double angle : new double[] {
+               Double.POSITIVE_INFINITY, Double.NEGATIVE_INFINITY, Double.NaN, 1e300, -1e17}) {
+        RotatedRect rect = new RotatedRect(new Point(80, 45), new Size(96, 24), angle);
+        renderText(
+            imageWithMarker(160, 90, new RotatedRect(rect.center, rect.size, 0)), "EXIT", rect);
+      }
+      assertEquals(List.of(), log.messages('E'));
+      RotatedRect rect = new RotatedRect(new Point(80, 45), new Size(96, 24), 0);
+      renderText(imageWithMarker(160, 90, rect), "EXIT", rect);
+      assertTrue(count(red(scene.pixels())) > 20);
+    }
+  }
+
+  @Test
   void aSecondInitialisationAfterShutDownDrawsAgain() {
     for (int round = 0; round < 2; ++round) {
       try (Scene scene = new Scene(160, 90, 160, 90)) {

@@ -40,6 +40,8 @@ public final class ResolutionJNI {
    *     0.5/sigma. Times the frame's width it gives the effective pixels across. {@link
    *     #NO_DETAIL} for a frame without detail; {@link #NOT_MEASURED} for a null address, an empty
    *     or smaller frame, or another type.
+   * @throws org.opencv.core.CvException should OpenCV fail on a frame that passed those checks (not
+   *     seen); the engine does not handle it
    */
   public static native double ImgResEstimate(long matAddr);
 }

@@ -2,6 +2,7 @@ package com.quenda.tessel.inpainting;
 
 import static org.junit.jupiter.api.Assertions.assertArrayEquals;
 import static org.junit.jupiter.api.Assertions.assertEquals;
+import static org.junit.jupiter.api.Assertions.assertThrows;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
@@ -11,6 +12,7 @@ import java.util.List;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
 import org.opencv.core.Core;
+import org.opencv.core.CvException;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.MatOfDouble;
@@ -198,5 +200,24 @@ class InpaintingJNITest {
 
     assertEquals(
         0, InpaintingJNI.CalculateMeansStdDevs(image, new double[4], new double[0], new double[0]));
+  }
+
+  @Test
+  void openCvErrorsInTheStatisticsReachTheHostAndTheNextCallWorks() {
+    // OpenCV has no statistics for half floats.
+    Mat halfFloats = Mat.zeros(120, 160, CvType.CV_16FC3);
+    double[] rects = {100, 100, 40, 20, 0};
+    CvException error = assertThrows(CvException.class,
+        ()
+            -> InpaintingJNI.CalculateMeansStdDevs(
+                halfFloats.getNativeObjAddr(), rects, new double[3], new double[3]));
+    assertTrue(error.getMessage().startsWith("OpenCV("), error.getMessage());
+    assertTrue(error.getMessage().contains("in function 'meanStdDev'"), error.getMessage());
+    assertEquals(List.of(), log.messages('E'));
+
+    double[] means = new double[3];
+    assertEquals(0,
+        InpaintingJNI.CalculateMeansStdDevs(frame.getNativeObjAddr(), rects, means, new double[3]));
+    assertArrayEquals(new double[] {215, 212, 205}, means, 1e-9);
   }
 }

@@ -4,6 +4,7 @@ import static org.junit.jupiter.api.Assertions.assertArrayEquals;
 import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertNotEquals;
 import static org.junit.jupiter.api.Assertions.assertNull;
+import static org.junit.jupiter.api.Assertions.assertThrows;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
@@ -13,7 +14,9 @@ import java.util.List;
 import org.junit.jupiter.api.AfterEach;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
+import org.junit.jupiter.api.function.Executable;
 import org.opencv.core.Core;
+import org.opencv.core.CvException;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.core.Rect;
@@ -121,5 +124,42 @@ class TrackingJNITest {
     dot.put(2, 2, 255, 255, 255, 255);
     assertEquals(Math.sqrt((1020.0 * 1020.0 + 4 * 255.0 * 255.0) / 25.0),
         TrackingJNI.calculateBlur(dot.getNativeObjAddr()), 1e-9);
+  }
+
+  /** Checks that the call raised OpenCV's own error, word for word as OpenCV worded it. */
+  private static void openCvError(Executable call, String detail) {
+    String message = assertThrows(CvException.class, call).getMessage();
+    assertTrue(message.startsWith("OpenCV(") && message.contains(detail), message);
+  }
+
+  @Test
+  void openCvErrorsReachTheHostAsExceptionsAndTheEngineCarriesOn() {
+    NativeLog log = new NativeLog();
+    // Too small to refine corners in, and no image at all.
+    Mat tiny = texturedFrame(2).submat(new Rect(0, 0, 10, 10)).clone();
+    openCvError(
+        ()
+            -> TrackingJNI.initializeTracker(tiny.getNativeObjAddr(), new double[] {5, 5, 8, 8, 0}),
+        "in function 'cornerSubPix'");
+    openCvError(()
+                    -> TrackingJNI.initializeTracker(new Mat().getNativeObjAddr(), WIDE),
+        "!_src.empty() in function 'cvtColor'");
+    // Both measures convert colour frames: two channels are none.
+    long twoChannels = new Mat(20, 30, CvType.CV_8UC2, new Scalar(1, 2)).getNativeObjAddr();
+    String channels = "Invalid number of channels in input image";
+    openCvError(() -> TrackingJNI.calculateFrameAccuracy(twoChannels, twoChannels), channels);
+    openCvError(() -> TrackingJNI.calculateBlur(twoChannels), channels);
+    // The engine handles none of them itself: no warning, no error logged.
+    assertEquals(List.of(), log.messages('W'));
+    assertEquals(List.of(), log.messages('E'));
+
+    // A running tracker fed a frame it cannot use keeps working on the next.
+    Mat frame = texturedFrame(7);
+    long handle = start(frame, WIDE);
+    assertThrows(CvException.class, () -> update(handle, new Mat()));
+    assertArrayEquals(WIDE, update(handle, frame), 0.1);
+    Mat gray = new Mat(20, 30, CvType.CV_8UC4, new Scalar(9, 9, 9, 255));
+    assertEquals(1.0,
+        TrackingJNI.calculateFrameAccuracy(gray.getNativeObjAddr(), gray.getNativeObjAddr()), 0.0);
   }
 }
