@@ -23,11 +23,13 @@ endfunction()
 
 # One ctest entry per *Test.java among SOURCES (below TEST_DIR), run by the JUnit console
 # launcher in a JVM with JVM_FLAGS and CLASSPATH, labelled <prefix>; the engine's log of each goes
-# to <build>/<prefix>-logs/<Test>.log.
+# to <build>/<prefix>-logs/<Test>.log. In the ASan build the JVM runs with the sanitizer runtimes
+# preloaded (OCR_JVM_SANITIZER_ENVIRONMENT); ENVIRONMENT adds variables of the caller's.
 #   ocr_add_junit_tests(<prefix> TEST_DIR dir SOURCES ... CLASSPATH cp JVM_FLAGS ...
-#                       WORKING_DIRECTORY dir)
+#                       WORKING_DIRECTORY dir [ENVIRONMENT var=value ...])
 function(ocr_add_junit_tests prefix)
-  cmake_parse_arguments(ARG "" "TEST_DIR;CLASSPATH;WORKING_DIRECTORY" "SOURCES;JVM_FLAGS" ${ARGN})
+  cmake_parse_arguments(ARG "" "TEST_DIR;CLASSPATH;WORKING_DIRECTORY"
+                        "SOURCES;JVM_FLAGS;ENVIRONMENT" ${ARGN})
   file(MAKE_DIRECTORY ${CMAKE_BINARY_DIR}/${prefix}-logs ${ARG_WORKING_DIRECTORY})
   foreach(source ${ARG_SOURCES})
     if(NOT source MATCHES "Test\\.java$")
@@ -42,8 +44,10 @@ function(ocr_add_junit_tests prefix)
                      -jar ${JUNIT_CONSOLE_JAR} --disable-banner --details=tree
                      --fail-if-no-tests --disable-ansi-colors
                      -cp ${ARG_CLASSPATH} --select-class=${class_name})
+    set(environment "OCRAR_LOG_FILE=${CMAKE_BINARY_DIR}/${prefix}-logs/${simple_name}.log"
+        "OCRAR_LOG_LEVEL=5" ${OCR_JVM_SANITIZER_ENVIRONMENT} ${ARG_ENVIRONMENT})
     set_tests_properties(${prefix}.${simple_name} PROPERTIES
-      ENVIRONMENT "OCRAR_LOG_FILE=${CMAKE_BINARY_DIR}/${prefix}-logs/${simple_name}.log;OCRAR_LOG_LEVEL=5"
+      ENVIRONMENT "${environment}"
       WORKING_DIRECTORY ${ARG_WORKING_DIRECTORY}
       LABELS ${prefix})
   endforeach()
