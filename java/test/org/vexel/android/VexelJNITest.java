@@ -7,6 +7,7 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
 import com.quenda.tessel.testing.OpenCvHost;
+import java.lang.ref.Reference;
 import java.nio.ByteBuffer;
 import java.util.List;
 import org.junit.jupiter.api.MethodOrderer;
@@ -49,8 +50,10 @@ class VexelJNITest {
     OpenCvHost.load();
     NativeLog log = new NativeLog();
     double[] rect = {1, 1, 2, 2, 0};
-    VexelJNI.renderOneFrame(new Mat(4, 4, CvType.CV_8UC4).getNativeObjAddr(), new String[] {"Exit"},
-        rect, rect, new long[] {1}, new long[] {0}, null, null, null);
+    Mat frame = new Mat(4, 4, CvType.CV_8UC4);
+    VexelJNI.renderOneFrame(frame.getNativeObjAddr(), new String[] {"Exit"}, rect, rect,
+        new long[] {1}, new long[] {0}, null, null, null);
+    Reference.reachabilityFence(frame);
     VexelJNI.renderOneFrame(0, null, null, null, null, null, null, null, null);
     VexelJNI.setOrientation(90);
     VexelJNI.setTranslationLanguageFont("ja", null);
@@ -168,8 +171,10 @@ class VexelJNITest {
     try (Scene scene = new Scene(160, 90, 160, 90)) {
       NativeLog log = new NativeLog();
       double[] rects = {80, 45, 100, 24, 0, 80, 45, 100, 24, 0};
-      VexelJNI.renderOneFrame(new Mat(90, 160, CvType.CV_8UC4, BACKGROUND).getNativeObjAddr(),
-          new String[] {null, "EXIT"}, rects, rects, null, null, null, null, null);
+      Mat frame = new Mat(90, 160, CvType.CV_8UC4, BACKGROUND);
+      VexelJNI.renderOneFrame(frame.getNativeObjAddr(), new String[] {null, "EXIT"}, rects, rects,
+          null, null, null, null, null);
+      Reference.reachabilityFence(frame);
       assertEquals(List.of("Vexel: GetStringUTFChars failed."), log.messages('E'));
       // The second text is drawn in the default colour, opaque black, across its middle row.
       Mat dark = inRange(scene.pixels(), new Scalar(0), new Scalar(39, 39, 255, 255));
@@ -270,11 +275,15 @@ class VexelJNITest {
     VexelJNI.renderOneFrame(image.getNativeObjAddr(), new String[] {text}, values, values,
         new long[] {1}, new long[] {patch.getNativeObjAddr()}, new double[] {1, 1, 1},
         new double[] {0, 0, 0}, new int[] {TEXT_COLOR});
+    // The engine reads both matrices through their addresses only.
+    Reference.reachabilityFence(image);
+    Reference.reachabilityFence(patch);
   }
 
   private static void renderEmpty(Mat image) {
     VexelJNI.renderOneFrame(
         image.getNativeObjAddr(), new String[0], null, null, null, null, null, null, null);
+    Reference.reachabilityFence(image);
   }
 
   /** 255 where every channel of {@code frame} lies in [low, high]. */

@@ -7,6 +7,7 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
 import com.quenda.tessel.testing.OpenCvHost;
+import java.lang.ref.Reference;
 import java.util.Arrays;
 import java.util.List;
 import org.junit.jupiter.api.BeforeAll;
@@ -135,9 +136,12 @@ class InpaintingJNITest {
     Mat rgba = new Mat(100, 100, CvType.CV_8UC4, new Scalar(1, 2, 3, 4));
     assertRefused(" Inpainting_Process: Error in type of convert RGBA to RGB.",
         rgba.getNativeObjAddr(), addresses(1), ONE_RECT, sentinelColors(1));
-    assertRefused(
-        emptyImage, new Mat().getNativeObjAddr(), addresses(1), ONE_RECT, sentinelColors(1));
+    Mat empty = new Mat();
+    assertRefused(emptyImage, empty.getNativeObjAddr(), addresses(1), ONE_RECT, sentinelColors(1));
     assertRefused(emptyImage, 0L, addresses(1), ONE_RECT, sentinelColors(1));
+    // The engine reads matrices by address only: they must outlive the calls.
+    Reference.reachabilityFence(rgba);
+    Reference.reachabilityFence(empty);
   }
 
   @Test
@@ -150,6 +154,7 @@ class InpaintingJNITest {
     assertTrue(outputs[0].empty() && outputs[1].empty());
     assertArrayEquals(new int[] {0xFF000000, 0xFF000000}, colors);
     assertTrue(log.messages('E').contains(" Inpainting_Process: input image size is too small "));
+    Reference.reachabilityFence(tiny);
   }
 
   @Test
@@ -164,6 +169,7 @@ class InpaintingJNITest {
     double[] deviations = new double[6];
     assertEquals(
         0, InpaintingJNI.CalculateMeansStdDevs(image.getNativeObjAddr(), rects, means, deviations));
+    Reference.reachabilityFence(image);
 
     Mat mask = Mat.zeros(image.size(), CvType.CV_8UC1);
     Imgproc.fillConvexPoly(mask,
@@ -219,5 +225,6 @@ class InpaintingJNITest {
     assertEquals(0,
         InpaintingJNI.CalculateMeansStdDevs(frame.getNativeObjAddr(), rects, means, new double[3]));
     assertArrayEquals(new double[] {215, 212, 205}, means, 1e-9);
+    Reference.reachabilityFence(halfFloats);
   }
 }

@@ -9,6 +9,7 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
 import com.quenda.tessel.testing.OpenCvHost;
+import java.lang.ref.Reference;
 import java.util.ArrayList;
 import java.util.List;
 import org.junit.jupiter.api.AfterEach;
@@ -42,13 +43,17 @@ class TrackingJNITest {
 
   private long start(Mat frame, double[] rects) {
     long handle = TrackingJNI.initializeTracker(frame.getNativeObjAddr(), rects);
+    // A matrix the engine reads only by address must outlive the call.
+    Reference.reachabilityFence(frame);
     assertNotEquals(0L, handle);
     handles.add(handle);
     return handle;
   }
 
   private static double[] update(long handle, Mat frame) {
-    return TrackingJNI.updateTracker(handle, frame.getNativeObjAddr());
+    double[] rects = TrackingJNI.updateTracker(handle, frame.getNativeObjAddr());
+    Reference.reachabilityFence(frame);
+    return rects;
   }
 
   /** 640 x 480 RGB frame of smoothed noise, with a flat grey band at the bottom. */
@@ -124,6 +129,9 @@ class TrackingJNITest {
     dot.put(2, 2, 255, 255, 255, 255);
     assertEquals(Math.sqrt((1020.0 * 1020.0 + 4 * 255.0 * 255.0) / 25.0),
         TrackingJNI.calculateBlur(dot.getNativeObjAddr()), 1e-9);
+    Reference.reachabilityFence(red);
+    Reference.reachabilityFence(green);
+    Reference.reachabilityFence(dot);
   }
 
   /** Checks that the call raised OpenCV's own error, word for word as OpenCV worded it. */
@@ -137,15 +145,17 @@ class TrackingJNITest {
     NativeLog log = new NativeLog();
     // Too small to refine corners in, and no image at all.
     Mat tiny = texturedFrame(2).submat(new Rect(0, 0, 10, 10)).clone();
+    Mat empty = new Mat();
     openCvError(
         ()
             -> TrackingJNI.initializeTracker(tiny.getNativeObjAddr(), new double[] {5, 5, 8, 8, 0}),
         "in function 'cornerSubPix'");
     openCvError(()
-                    -> TrackingJNI.initializeTracker(new Mat().getNativeObjAddr(), WIDE),
+                    -> TrackingJNI.initializeTracker(empty.getNativeObjAddr(), WIDE),
         "!_src.empty() in function 'cvtColor'");
     // Both measures convert colour frames: two channels are none.
-    long twoChannels = new Mat(20, 30, CvType.CV_8UC2, new Scalar(1, 2)).getNativeObjAddr();
+    Mat twoChannelMat = new Mat(20, 30, CvType.CV_8UC2, new Scalar(1, 2));
+    long twoChannels = twoChannelMat.getNativeObjAddr();
     String channels = "Invalid number of channels in input image";
     openCvError(() -> TrackingJNI.calculateFrameAccuracy(twoChannels, twoChannels), channels);
     openCvError(() -> TrackingJNI.calculateBlur(twoChannels), channels);
@@ -161,5 +171,8 @@ class TrackingJNITest {
     Mat gray = new Mat(20, 30, CvType.CV_8UC4, new Scalar(9, 9, 9, 255));
     assertEquals(1.0,
         TrackingJNI.calculateFrameAccuracy(gray.getNativeObjAddr(), gray.getNativeObjAddr()), 0.0);
+    for (Mat mat : new Mat[] {tiny, empty, twoChannelMat, gray}) {
+      Reference.reachabilityFence(mat);
+    }
   }
 }

@@ -5,6 +5,7 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import com.quenda.tessel.testing.NativeLog;
 import com.quenda.tessel.testing.OpenCvHost;
+import java.lang.ref.Reference;
 import java.util.List;
 import java.util.Random;
 import org.junit.jupiter.api.BeforeAll;
@@ -41,7 +42,10 @@ class ResolutionJNITest {
   }
 
   private static double estimate(Mat frame) {
-    return ResolutionJNI.ImgResEstimate(frame.getNativeObjAddr());
+    double estimate = ResolutionJNI.ImgResEstimate(frame.getNativeObjAddr());
+    // The engine reads the matrix by address only: it must outlive the call.
+    Reference.reachabilityFence(frame);
+    return estimate;
   }
 
   @Test
@@ -69,11 +73,16 @@ class ResolutionJNITest {
   @Test
   void badInputIsNotMeasuredAndLogged() {
     assertNotMeasured(0L, "ImgResEstimate: null image address");
-    assertNotMeasured(new Mat().getNativeObjAddr(), "ImgResEstimate: empty image");
-    assertNotMeasured(new Mat(60, 80, CvType.CV_8UC4, new Scalar(1, 2, 3, 4)).getNativeObjAddr(),
+    Mat empty = new Mat();
+    Mat small = new Mat(60, 80, CvType.CV_8UC4, new Scalar(1, 2, 3, 4));
+    Mat wide = new Mat(720, 1280, CvType.CV_16UC4, new Scalar(1, 2, 3, 4));
+    assertNotMeasured(empty.getNativeObjAddr(), "ImgResEstimate: empty image");
+    assertNotMeasured(small.getNativeObjAddr(),
         "ImgResEstimate: image 80x60 is too small (needs at least 96 pixels on each side)");
-    assertNotMeasured(
-        new Mat(720, 1280, CvType.CV_16UC4, new Scalar(1, 2, 3, 4)).getNativeObjAddr(),
+    assertNotMeasured(wide.getNativeObjAddr(),
         "ImgResEstimate: unsupported image type CV_16UC4 (need 8-bit RGBA, RGB or grey)");
+    for (Mat mat : new Mat[] {empty, small, wide}) {
+      Reference.reachabilityFence(mat);
+    }
   }
 }

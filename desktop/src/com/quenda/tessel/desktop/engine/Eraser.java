@@ -4,6 +4,7 @@ import com.quenda.tessel.Constants;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.inpainting.InpaintingJNI;
+import java.lang.ref.Reference;
 import java.util.ArrayList;
 import java.util.List;
 import org.opencv.core.Mat;
@@ -59,6 +60,8 @@ public final class Eraser {
     }
     int status = InpaintingJNI.InpaintingRotRectImg(
         rgb.getNativeObjAddr(), patches.addresses(), rects, patches.colors);
+    // The engine reads the frame by address only; the collector must not free it meanwhile.
+    Reference.reachabilityFence(rgb);
     if (status != 0) {
       patches.release();
       throw new HostException(

@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.engine;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
+import java.lang.ref.Reference;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
 import org.opencv.imgproc.Imgproc;
@@ -55,6 +56,8 @@ public final class OverlayDrawer implements AutoCloseable {
     VexelJNI.renderOneFrame(rgba.getNativeObjAddr(), overlays.texts, overlays.patchRects,
         overlays.textRects, overlays.ids, overlays.patchAddresses, overlays.colorScales,
         new double[3 * n], overlays.colors);
+    // The engine reads the frame by address only; the collector must not free it meanwhile.
+    Reference.reachabilityFence(rgba);
     return readBack();
   }
 
