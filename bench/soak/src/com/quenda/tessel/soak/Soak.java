@@ -29,7 +29,7 @@ public final class Soak {
   private static final int ERASE_EVERY = 10;
   private static final int RUN_LENGTH = 150;
   // One sweep of the bundled camera; the soak runs it forwards and backwards.
-  private static final int SWEEP = 300;
+  private static final int SWEEP = 301;
   private static final double GROWTH_LIMIT_PERCENT = 2;
 
   private Soak() {}
@@ -43,6 +43,7 @@ public final class Soak {
     StepTimes times =
         new StepTimes("track", "erase", "start run (track+erase)", "draw + read back", "total");
     long warmKib = 0;
+    ResidentMemory.Arenas warmArenas = null;
     long peakKib = 0;
     int peakFrame = 0;
     int runs = 0;
@@ -83,6 +84,7 @@ public final class Soak {
         long kib = ResidentMemory.kib();
         if (k == warmup - 1) {
           warmKib = kib;
+          warmArenas = ResidentMemory.mallocArenas();
         }
         if (kib > peakKib) {
           peakKib = kib;
@@ -111,6 +113,10 @@ public final class Soak {
     row("peak (frame " + (peakFrame + 1) + ")", peakKib);
     System.err.printf("    %-28s %+9.1f MiB (%+.2f %%, limit %.0f %%)%n", "growth after warm-up",
         (endKib - warmKib) / 1024.0, growth, GROWTH_LIMIT_PERCENT);
+    ResidentMemory.Arenas endArenas = ResidentMemory.mallocArenas();
+    System.err.printf("    %-28s %+9.1f MiB (%d arenas after warm-up, %d at the end)%n",
+        "of which in malloc arenas", (endArenas.kib() - warmArenas.kib()) / 1024.0,
+        warmArenas.count(), endArenas.count());
     System.err.print(times.table());
     System.exit(growth > GROWTH_LIMIT_PERCENT ? 1 : 0);
   }
