@@ -54,7 +54,7 @@ engine="$PWD/(src|vexel|platform)/|libocr_ndk|libVexelKit|libandroid_desktop"
 sed 's/^==[0-9]*== \{0,1\}//' "$log" | awk -v engine="$engine" -v out="$out" '
   function flush() {
     if (record != "" && record ~ engine) {
-      if (record ~ /definitely lost/ && record ~ /OcrTrackerRotRect::StartTracker/) {
+      if (record ~ /definitely lost/ && record ~ /OcrTrackerRotRect::AppendReferences/) {
         accepted++; accepted_bytes += bytes
       } else {
         unexpected++; print record "\n" > (out "/unexpected.txt")

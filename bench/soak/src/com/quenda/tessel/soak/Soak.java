@@ -114,9 +114,11 @@ public final class Soak {
     System.err.printf("    %-28s %+9.1f MiB (%+.2f %%, limit %.0f %%)%n", "growth after warm-up",
         (endKib - warmKib) / 1024.0, growth, GROWTH_LIMIT_PERCENT);
     ResidentMemory.Arenas endArenas = ResidentMemory.mallocArenas();
-    System.err.printf("    %-28s %+9.1f MiB (%d arenas after warm-up, %d at the end)%n",
-        "of which in malloc arenas", (endArenas.kib() - warmArenas.kib()) / 1024.0,
-        warmArenas.count(), endArenas.count());
+    if (endArenas.count() > 0) {
+      System.err.printf("    %-28s %+9.1f MiB (%d arenas after warm-up, %d at the end)%n",
+          "of which in malloc arenas", (endArenas.kib() - warmArenas.kib()) / 1024.0,
+          warmArenas.count(), endArenas.count());
+    }
     System.err.print(times.table());
     System.exit(growth > GROWTH_LIMIT_PERCENT ? 1 : 0);
   }
