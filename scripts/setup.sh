@@ -16,6 +16,8 @@ packages=(
   libgtest-dev libgmock-dev libbenchmark-dev
   # headless drawing: EGL + GLES2 on Mesa's software rasteriser
   libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
+  # the real NDK headers for the log and the asset manager, for the Android compile check
+  android-liblog-dev android-platform-frameworks-native-headers
   # text: glyphs, shaping, bidi, and fonts for Latin, CJK, Arabic, Hebrew
   libfreetype-dev libharfbuzz-dev libfribidi-dev libicu-dev
   fonts-noto-cjk fonts-wqy-microhei fonts-noto-core fonts-dejavu-core
