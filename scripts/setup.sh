@@ -14,6 +14,8 @@ packages=(
   openjdk-17-jdk-headless libopencv-java libopencv406-jni junit5
   # C++ tests and benchmarks
   libgtest-dev libgmock-dev libbenchmark-dev
+  # the leak check of one JVM run (scripts/memcheck.sh)
+  valgrind
   # headless drawing: EGL + GLES2 on Mesa's software rasteriser
   libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
   # the real NDK headers for the log and the asset manager, for the Android compile check

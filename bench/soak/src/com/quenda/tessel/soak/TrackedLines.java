@@ -6,6 +6,7 @@ import com.quenda.tessel.desktop.engine.Overlays;
 import com.quenda.tessel.desktop.engine.Rects;
 import com.quenda.tessel.desktop.scenes.SceneLine;
 import com.quenda.tessel.tracking.TrackingJNI;
+import java.lang.ref.Reference;
 import java.util.ArrayList;
 import java.util.List;
 import org.opencv.core.Mat;
@@ -48,6 +49,8 @@ final class TrackedLines implements AutoCloseable {
   /** Moves every line into {@code rgb}; returns how many are still in view. */
   int track(Mat rgb) {
     double[] rects = TrackingJNI.updateTracker(tracker, rgb.getNativeObjAddr());
+    // The engine reads the frame by address only: it must outlive the call.
+    Reference.reachabilityFence(rgb);
     int inView = 0;
     for (int i = 0; i < places.length; i++) {
       boolean lost = rects == null || rects[5 * i + 2] == 0 || rects[5 * i + 3] == 0;
