@@ -22,6 +22,11 @@ def num(v):
     return bytes([200]) + struct.pack('<d', v)
 
 
+def side(v):
+    """A Side(): one byte below 64, else a marker byte and the full range."""
+    return bytes([v]) if v < 64 else bytes([0xC0]) + u16(v)
+
+
 def nums(values):
     return b''.join(num(v) for v in values)
 
@@ -38,12 +43,12 @@ TEXT = [(10, 40, 0, 0, (20, 20, 20), 2, (4, 1)), (60, 45, 0, 0, (30, 10, 10), 2,
 
 
 def inpainting(rows, cols, channel_pick, values, shapes=TEXT):
-    return u16(rows) + u16(cols) + bytes([channel_pick, len(values)]) + nums(values) + image(
+    return side(rows) + side(cols) + bytes([channel_pick, len(values)]) + nums(values) + image(
         shapes=shapes)
 
 
 def statistics(rows, cols, channel_pick, as_float, values, skew=0):
-    return (u16(rows) + u16(cols) + bytes([channel_pick, 1 if as_float else 3, len(values)]) +
+    return (side(rows) + side(cols) + bytes([channel_pick, 1 if as_float else 3, len(values)]) +
             nums(values) + bytes([skew]) + image(shapes=TEXT))
 
 
@@ -83,7 +88,7 @@ def mapping(rects, orientation_pick, fitted, count, absent=()):
 
 def text(face, width, align, spacing, reference, utf8, repeat=0):
     head = bytes([face, width, align, spacing & 0xFF, reference])
-    head += bytes([0, repeat]) if repeat else bytes([1])
+    head += bytes([0, repeat]) if repeat else bytes([1])  # repeat: copies - 1
     return head + utf8.encode('utf-8', 'surrogatepass') if isinstance(utf8, str) else head + utf8
 
 
@@ -129,11 +134,32 @@ SEEDS = {
     },
 }
 
-if __name__ == '__main__':
+# Inputs of past findings that are easier to state than to keep as the
+# fuzzer wrote them (the others in regressions/ are the fuzzer's own).
+REGRESSIONS = {
+    'color_statistics': {
+        # Half a rectangle 2^31 px tall: the mask fill walked ~10^9 rows.
+        'mask-fill-walks-rows-above-huge-rect': statistics(100, 150, 0, False,
+                                                           [100, 0, 40, 'int_max+1', 0]),
+    },
+    'text_layout': {
+        # 2,000 characters, one per line and per run: quadratic line collection.
+        'quadratic-line-collection-alternating-scripts': text(2, 1, 0, 0, 0, 'a字' * 250,
+                                                              repeat=7),
+    },
+}
+
+
+def write(kind, table):
     here = os.path.dirname(os.path.abspath(__file__))
-    for target, seeds in SEEDS.items():
-        folder = os.path.join(here, 'corpus', target)
+    for target, inputs in table.items():
+        folder = os.path.join(here, kind, target)
         os.makedirs(folder, exist_ok=True)
-        for name, data in seeds.items():
+        for name, data in inputs.items():
             with open(os.path.join(folder, name), 'wb') as f:
                 f.write(data)
+
+
+if __name__ == '__main__':
+    write('corpus', SEEDS)
+    write('regressions', REGRESSIONS)

@@ -14,6 +14,8 @@ packages=(
   openjdk-17-jdk-headless libopencv-java libopencv406-jni junit5
   # C++ tests and benchmarks
   libgtest-dev libgmock-dev libbenchmark-dev
+  # fuzzing (scripts/fuzz.sh): clang with libFuzzer and the sanitizer runtimes
+  clang libclang-rt-14-dev
   # headless drawing: EGL + GLES2 on Mesa's software rasteriser
   libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
   # text: glyphs, shaping, bidi, and fonts for Latin, CJK, Arabic, Hebrew

@@ -23,6 +23,13 @@ class FuzzInput {
   // Uniform enough in [lo, hi] for lo <= hi and a span below 65536.
   int Range(int lo, int hi) { return lo + static_cast<int>(U16() % (hi - lo + 1)); }
 
+  // An image side in 0..max: mostly below 64 from one byte, which keeps most
+  // runs cheap, else anywhere in the range.
+  int Side(int max) {
+    const std::uint8_t small = Byte();
+    return small < 192 ? small % 64 : Range(0, max);
+  }
+
   // A value as a host might send it: usually a moderate number of pixels or
   // degrees (quarter steps in -512..512), sometimes one of the troublesome
   // values (NaN, infinities, huge, tiny, signed zero, past float range), and

@@ -14,8 +14,8 @@
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   ocr_fuzz::FuzzInput in(data, size);
-  const int rows = in.Range(0, 300);
-  const int cols = in.Range(0, 300);
+  const int rows = in.Side(300);
+  const int cols = in.Side(300);
   static constexpr int kChannels[] = {3, 1, 4};
   const int channels = kChannels[in.Byte() % 3];
   const bool as_float = in.Byte() % 4 == 0;
@@ -41,8 +41,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   std::vector<double> std_devs(std_devs_length, kUntouched);
   try {
     const int status = ocr_inpainting::CalculateRectMeansStdDevs(
-        image, rect_values.data(), rect_values.size(), means.data(), means.size(),
-        std_devs.data(), std_devs.size());
+        image, rect_values.data(), rect_values.size(), means.data(), means.size(), std_devs.data(),
+        std_devs.size());
     if (status != 0) {
       for (double v : means)
         if (v != kUntouched)

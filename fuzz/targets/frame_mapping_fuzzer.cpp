@@ -84,7 +84,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   auto id = [&in] { return static_cast<std::int64_t>(in.U16()) << (in.Byte() % 48); };
   auto address = [&in, &mats]() -> std::int64_t {
     const std::uint8_t pick = in.Byte() % (mats.size() + 1);
-    return pick == 0 ? 0 : static_cast<std::int64_t>(reinterpret_cast<std::uintptr_t>(&mats[pick - 1]));
+    return pick == 0 ? 0
+                     : static_cast<std::int64_t>(reinterpret_cast<std::uintptr_t>(&mats[pick - 1]));
   };
   auto colour = [&in] { return static_cast<std::int32_t>(in.U16() << 16 | in.U16()); };
 
@@ -107,9 +108,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
 
   (void)ocr_ar::HasAllRects(arrays, text_count);
   for (std::size_t i = 0; i < text_count; ++i) {
-    const ocr_ar::TextRecord record =
-        in.Byte() % 16 == 0 ? ocr_ar::UnreadableTextRecord()
-                            : ocr_ar::UnpackTextRecord(arrays, i, "text");
+    const ocr_ar::TextRecord record = in.Byte() % 16 == 0
+                                          ? ocr_ar::UnreadableTextRecord()
+                                          : ocr_ar::UnpackTextRecord(arrays, i, "text");
     // As the bridge draws one text.
     for (const ocr_ar::ImageRect& rect : {record.patch_rect, record.text_rect}) {
       const ocr_ar::ImageRect oriented =

@@ -15,8 +15,8 @@
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   ocr_fuzz::FuzzInput in(data, size);
-  const int rows = in.Range(0, 300);
-  const int cols = in.Range(0, 300);
+  const int rows = in.Side(300);
+  const int cols = in.Side(300);
   static constexpr int kChannels[] = {3, 1, 4};
   const int channels = kChannels[in.Byte() % 3];
   std::vector<double> rect_values(in.Byte() % 23);
