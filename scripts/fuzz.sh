@@ -39,6 +39,13 @@ for target in "${targets[@]}"; do
   log="build-fuzz/findings/$target.log"
   echo "fuzz: $target ..."
   set +e
+  # The inputs of past findings first, once each, under clang's sanitizers.
+  regressions=(fuzz/regressions/"$target"/[!.]*)
+  if [ -e "${regressions[0]}" ] &&
+    ! "build-fuzz/bin/${target}_fuzzer" -close_fd_mask=1 "${regressions[@]}" >"$log.replay" 2>&1; then
+    echo "fuzz: $target fails on a regression input, see $log.replay"
+    status=1
+  fi
   nice -n 10 "build-fuzz/bin/${target}_fuzzer" "${limit[@]}" -max_len="${max_len[$target]}" \
     -timeout=25 -rss_limit_mb=4096 -close_fd_mask=1 -print_final_stats=1 -artifact_prefix="$findings/" \
     "$work" >"$log" 2>&1
