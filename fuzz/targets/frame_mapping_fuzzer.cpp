@@ -38,6 +38,8 @@ HostArray<T> Array(ocr_fuzz::FuzzInput& in, std::vector<T>& storage, Fill fill) 
   const std::uint8_t length = in.Byte();
   if (length == 0xFF)
     return {};
+  // A present array of length 0 still has an address, as a JVM gives it.
+  storage.reserve(1);
   storage.resize(length % 41);
   for (T& value : storage)
     value = fill();
