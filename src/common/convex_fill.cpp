@@ -1,8 +1,6 @@
 #include "common/convex_fill.h"
 
-#include <algorithm>
 #include <cmath>
-#include <limits>
 #include <vector>
 
 #include <opencv2/imgproc.hpp>
@@ -10,40 +8,57 @@
 namespace ocr {
 namespace {
 
-int RoundToInt(double value) {
-  constexpr double kMax = std::numeric_limits<int>::max();
-  constexpr double kMin = std::numeric_limits<int>::min();
-  return static_cast<int>(std::lround(std::min(std::max(value, kMin), kMax)));
+// One Sutherland-Hodgman step: the part of `polygon` on the side of the
+// line `axis` = `bound` where `keep(coordinate)` holds.
+template <typename Keep>
+std::vector<cv::Point2d> Cut(const std::vector<cv::Point2d>& polygon, int axis, double bound,
+                             Keep keep) {
+  std::vector<cv::Point2d> kept;
+  const auto along = [axis](const cv::Point2d& p) { return axis == 0 ? p.x : p.y; };
+  for (std::size_t i = 0; i < polygon.size(); ++i) {
+    const cv::Point2d& a = polygon[i];
+    const cv::Point2d& b = polygon[(i + 1) % polygon.size()];
+    const bool a_in = keep(along(a));
+    if (a_in)
+      kept.push_back(a);
+    if (a_in != keep(along(b))) {
+      const double t = (bound - along(a)) / (along(b) - along(a));
+      cv::Point2d cut = a + t * (b - a);
+      (axis == 0 ? cut.x : cut.y) = bound;
+      kept.push_back(cut);
+    }
+  }
+  return kept;
 }
 
 }  // namespace
 
 void FillConvexPolygon(cv::Mat& image, const cv::Point* points, int count,
                        const cv::Scalar& color) {
-  constexpr int kTop = -kConvexFillMargin;
-  bool reaches_above = false;
-  for (int i = 0; i < count; ++i)
-    reaches_above = reaches_above || points[i].y < kTop;
-  if (!reaches_above) {
+  const double left = -kConvexFillMargin;
+  const double top = -kConvexFillMargin;
+  const double right = static_cast<double>(image.cols) + kConvexFillMargin;
+  const double bottom = static_cast<double>(image.rows) + kConvexFillMargin;
+  bool inside = true;
+  for (int i = 0; i < count; ++i) {
+    inside = inside && points[i].x >= left && points[i].x <= right && points[i].y >= top &&
+             points[i].y <= bottom;
+  }
+  if (inside) {
     cv::fillConvexPoly(image, points, count, color, cv::LINE_8, 0);
     return;
   }
-  // One Sutherland-Hodgman step against the half-plane y >= kTop.
-  std::vector<cv::Point> kept;
-  for (int i = 0; i < count; ++i) {
-    const cv::Point& a = points[i];
-    const cv::Point& b = points[(i + 1) % count];
-    const bool a_in = a.y >= kTop;
-    const bool b_in = b.y >= kTop;
-    if (a_in)
-      kept.push_back(a);
-    if (a_in != b_in) {
-      const double t = (static_cast<double>(kTop) - a.y) / (static_cast<double>(b.y) - a.y);
-      kept.emplace_back(RoundToInt(a.x + t * (static_cast<double>(b.x) - a.x)), kTop);
-    }
-  }
-  if (kept.size() >= 3)
-    cv::fillConvexPoly(image, kept.data(), static_cast<int>(kept.size()), color, cv::LINE_8, 0);
+  std::vector<cv::Point2d> polygon(points, points + count);
+  polygon = Cut(polygon, 0, left, [left](double v) { return v >= left; });
+  polygon = Cut(polygon, 0, right, [right](double v) { return v <= right; });
+  polygon = Cut(polygon, 1, top, [top](double v) { return v >= top; });
+  polygon = Cut(polygon, 1, bottom, [bottom](double v) { return v <= bottom; });
+  if (polygon.size() < 3)
+    return;
+  std::vector<cv::Point> rounded;
+  for (const cv::Point2d& p : polygon)
+    rounded.emplace_back(static_cast<int>(std::lround(p.x)), static_cast<int>(std::lround(p.y)));
+  cv::fillConvexPoly(image, rounded.data(), static_cast<int>(rounded.size()), color, cv::LINE_8, 0);
 }
 
 }  // namespace ocr

@@ -5,12 +5,13 @@
 namespace ocr {
 
 // cv::fillConvexPoly for polygons built from the host's rectangles, which
-// can reach anywhere. OpenCV walks every row from the polygon's top down to
-// the image's bottom edge, above the image or not, so a corner a billion
-// rows up costs seconds. The part of the polygon more than
-// kConvexFillMargin rows above the image is cut away first; any polygon
-// that stays below that line is drawn exactly as OpenCV draws it (the
-// vertices of a cut lie on that line, rounded to whole pixels).
+// can reach anywhere. OpenCV walks every row from the polygon's top to the
+// image's bottom edge, above the image or not, so a corner a billion rows up
+// costs seconds; and its edge slopes overflow for corners 2^30 apart, which
+// ends the process with a division by zero. So the polygon is first cut to
+// the image grown by kConvexFillMargin on every side. A polygon inside that
+// box is drawn exactly as OpenCV draws it; the vertices of a cut lie on the
+// box, rounded to whole pixels.
 inline constexpr int kConvexFillMargin = 1 << 16;
 void FillConvexPolygon(cv::Mat& image, const cv::Point* points, int count, const cv::Scalar& color);
 
