@@ -9,7 +9,7 @@ if(OCR_SANITIZE AND OCR_TSAN)
 endif()
 
 if(OCR_SANITIZE)
-  set(OCR_SANITIZER_FLAGS -fsanitize=address,undefined -fno-omit-frame-pointer
+  set(OCR_SANITIZER_FLAGS -fsanitize=address,undefined,float-cast-overflow -fno-omit-frame-pointer
                           -fno-sanitize-recover=undefined)
 elseif(OCR_TSAN)
   set(OCR_SANITIZER_FLAGS -fsanitize=thread -fno-omit-frame-pointer)

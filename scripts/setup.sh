@@ -16,6 +16,8 @@ packages=(
   libgtest-dev libgmock-dev libbenchmark-dev
   # the leak check of one JVM run (scripts/memcheck.sh)
   valgrind
+  # fuzzing (scripts/fuzz.sh): clang with libFuzzer and the sanitizer runtimes
+  clang libclang-rt-14-dev
   # headless drawing: EGL + GLES2 on Mesa's software rasteriser
   libegl-dev libgles-dev libegl-mesa0 libgl1-mesa-dri
   # the real NDK headers for the log and the asset manager, for the Android compile check

@@ -11,6 +11,7 @@
 #include <opencv2/imgproc.hpp>
 #include <opencv2/video/tracking.hpp>
 
+#include "common/convex_fill.h"
 #include "common/log.h"
 
 namespace zeph {
@@ -55,7 +56,9 @@ void ZeroQuadsOffPicture(std::vector<cv::Point2f>& corners, int cols, int rows) 
     float min_x = quad[0].x, max_x = quad[0].x, min_y = quad[0].y, max_y = quad[0].y;
     for (int k = 0; k < 4; ++k) {
       const cv::Point2f& p = quad[k];
-      if (p.x < -cols || p.x > 2 * cols || p.y < -rows || p.y > 2 * rows)
+      // A degenerate homography yields NaN or infinite corners: thrown away too.
+      if (!std::isfinite(p.x) || !std::isfinite(p.y) || p.x < -cols || p.x > 2 * cols ||
+          p.y < -rows || p.y > 2 * rows)
         extreme = true;
       min_x = std::min(min_x, p.x);
       max_x = std::max(max_x, p.x);
@@ -106,7 +109,7 @@ std::vector<cv::Point2f> OcrTracker::GetTrackingPoints(const std::vector<cv::Poi
     cv::Point quad[4];
     for (int k = 0; k < 4; ++k)
       quad[k] = cv::Point(cvRound(corners[first + k].x), cvRound(corners[first + k].y));
-    cv::fillConvexPoly(mask, quad, 4, cv::Scalar(1), cv::LINE_8, 0);
+    ocr::FillConvexPolygon(mask, quad, 4, cv::Scalar(1));
   }
   const int area = cv::countNonZero(mask);
   OCR_LOGD("OcrTracker::GetTrackingPoints Total area %.1f", static_cast<double>(area));

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <utility>
 
 #include "unicode_text.h"
 
@@ -205,30 +206,49 @@ struct LineGlyphs {
   float width = 0.0f;
 };
 
+// The glyphs of `run` that belong to characters [start, end). HarfBuzz keeps
+// clusters monotonic in the run's direction (ascending left to right,
+// descending right to left), so the range is found by bisection: a long
+// paragraph broken into many lines would otherwise visit every glyph once
+// per line.
+std::pair<const ShapedGlyph*, const ShapedGlyph*> GlyphsOf(const Run& run, std::size_t start,
+                                                           std::size_t end) {
+  const ShapedGlyph* first = run.glyphs.data();
+  const ShapedGlyph* last = first + run.glyphs.size();
+  if (run.level % 2 == 0) {
+    auto before = [](const ShapedGlyph& g, std::size_t c) { return g.cluster < c; };
+    return {std::lower_bound(first, last, start, before),
+            std::lower_bound(first, last, end, before)};
+  }
+  auto before = [](const ShapedGlyph& g, std::size_t c) { return g.cluster >= c; };
+  return {std::lower_bound(first, last, end, before), std::lower_bound(first, last, start, before)};
+}
+
 LineGlyphs CollectLine(const std::u32string& p, const std::vector<Run>& runs, std::size_t start,
                        std::size_t end, float extra) {
   while (end > start && IsWhiteSpace(p[end - 1]))
     --end;
+  // Runs are in logical order and do not overlap: those of the line follow
+  // the first one that ends after its start.
   std::vector<const Run*> line_runs;
-  for (const Run& run : runs) {
-    if (run.start < end && run.end > start)
-      line_runs.push_back(&run);
-  }
+  auto run = std::partition_point(runs.begin(), runs.end(),
+                                  [start](const Run& r) { return r.end <= start; });
+  for (; run != runs.end() && run->start < end; ++run)
+    line_runs.push_back(&*run);
   ReorderVisually(line_runs);
   LineGlyphs line;
   bool first = true;
   std::uint32_t previous_cluster = 0;
-  for (const Run* run : line_runs) {
-    for (const ShapedGlyph& glyph : run->glyphs) {
-      if (glyph.cluster < start || glyph.cluster >= end)
-        continue;
-      if (!first && glyph.cluster != previous_cluster)
+  for (const Run* line_run : line_runs) {
+    const auto [from, to] = GlyphsOf(*line_run, start, end);
+    for (const ShapedGlyph* glyph = from; glyph != to; ++glyph) {
+      if (!first && glyph->cluster != previous_cluster)
         line.width += extra;
-      ShapedGlyph placed = glyph;
+      ShapedGlyph placed = *glyph;
       placed.x_offset += line.width;  // pen position folded into the offset
       line.glyphs.push_back(placed);
-      line.width += glyph.advance;
-      previous_cluster = glyph.cluster;
+      line.width += glyph->advance;
+      previous_cluster = glyph->cluster;
       first = false;
     }
   }

@@ -6,6 +6,7 @@
 #include <opencv2/core.hpp>
 #include <opencv2/imgproc.hpp>
 
+#include "common/convex_fill.h"
 #include "common/log.h"
 #include "inpainting/driver/numeric_casts.h"
 #include "inpainting/driver/rect_clipping.h"
@@ -42,7 +43,7 @@ void MeasureRect(const cv::Mat& image, const cv::RotatedRect& rect, cv::Mat& mea
     polygon[k] = cv::Point(SaturatingTruncToInt(corners[k].x - static_cast<float>(bound.x)),
                            SaturatingTruncToInt(corners[k].y - static_cast<float>(bound.y)));
   }
-  cv::fillConvexPoly(mask, polygon, 4, cv::Scalar(255), cv::LINE_8, 0);
+  ocr::FillConvexPolygon(mask, polygon, 4, cv::Scalar(255));
   cv::meanStdDev(image(bound), mean, deviation, mask);
 }
 
