@@ -10,7 +10,7 @@ endif()
 
 if(OCR_SANITIZE)
   set(OCR_SANITIZER_FLAGS -fsanitize=address,undefined,float-cast-overflow -fno-omit-frame-pointer
-                          -fno-sanitize-recover=undefined)
+                          -fno-sanitize-recover=undefined,float-cast-overflow)
 elseif(OCR_TSAN)
   set(OCR_SANITIZER_FLAGS -fsanitize=thread -fno-omit-frame-pointer)
   # TBB's headers announce their task hand-overs to threading tools; the tests turn those
