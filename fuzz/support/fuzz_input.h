@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <vector>
 
 // Reads a fuzzer's input as a stream of small decisions. Past the end every
 // read yields zero, so any prefix of an input is itself a valid input.
@@ -35,6 +36,21 @@ class FuzzInput {
   // values (NaN, infinities, huge, tiny, signed zero, past float range), and
   // sometimes eight raw bytes.
   double Double();
+
+  // 0..max_count values read by Double(), the count from one byte: the flat
+  // five-per-rectangle arrays of the host, counts off by any amount included.
+  std::vector<double> Doubles(std::size_t max_count) {
+    std::vector<double> values(Byte() % (max_count + 1));
+    for (double& value : values)
+      value = Double();
+    return values;
+  }
+
+  // The channel count of a host image: 3 most often, else 1 or 4.
+  int Channels() {
+    static constexpr int kChannels[] = {3, 1, 4};
+    return kChannels[Byte() % 3];
+  }
 
   // The rest of the input as a string of bytes.
   std::string Rest();

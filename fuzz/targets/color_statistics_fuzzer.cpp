@@ -16,12 +16,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   ocr_fuzz::FuzzInput in(data, size);
   const int rows = in.Side(300);
   const int cols = in.Side(300);
-  static constexpr int kChannels[] = {3, 1, 4};
-  const int channels = kChannels[in.Byte() % 3];
+  const int channels = in.Channels();
   const bool as_float = in.Byte() % 4 == 0;
-  std::vector<double> rect_values(in.Byte() % 33);
-  for (double& value : rect_values)
-    value = in.Double();
+  const std::vector<double> rect_values = in.Doubles(32);
   // Mostly the lengths the host computes; sometimes one more or one fewer.
   const std::size_t count = rect_values.size() / 5;
   const int skew = in.Byte() % 8;

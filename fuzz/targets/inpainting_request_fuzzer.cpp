@@ -17,11 +17,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   ocr_fuzz::FuzzInput in(data, size);
   const int rows = in.Side(300);
   const int cols = in.Side(300);
-  static constexpr int kChannels[] = {3, 1, 4};
-  const int channels = kChannels[in.Byte() % 3];
-  std::vector<double> rect_values(in.Byte() % 23);
-  for (double& value : rect_values)
-    value = in.Double();
+  const int channels = in.Channels();
+  const std::vector<double> rect_values = in.Doubles(22);
   const cv::Mat image = ocr_fuzz::SyntheticImage(in, rows, cols, channels);
 
   // The bridge sizes the output list by the rectangle count and refuses
