@@ -5,84 +5,173 @@ import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
 import java.io.IOException;
+import java.io.PrintStream;
+import java.nio.file.Files;
+import java.nio.file.Path;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.Map;
+import java.util.regex.Matcher;
 import java.util.regex.Pattern;
 
 /**
- * Translation by the apertium program, all lines of an image in one run.
+ * Translation by Apertium, kept running for the whole run, with the sign memory and the editing
+ * rules around it. Each text is translated on its own, in this order:
  *
- * <p>Apertium reads running text: lines separated by a single line break are one paragraph, and
- * its rules move words across the break ("Please keep / the door closed" comes back with words of
- * one line in the other). A blank line ends a paragraph, so the lines go in separated by blank
- * lines and come back the same way. Unknown words come back marked with '*' (and words it failed
- * to inflect with '#' or '@'); the marks are dropped from the drawn text, and a line in which
- * every word was unknown counts as not translated.
+ * <ol>
+ *   <li>its case is noted and the text put in sentence case ({@link CaseStyle});
+ *   <li>a text the memory knows whole is translated by the memory alone;
+ *   <li>else the editing rules take their look ({@link SignRules}), and the text goes to Apertium
+ *       as one segment, with known segments of the memory and numbers and times protected as
+ *       superblanks, so that Apertium translates around them;
+ *   <li>Apertium's marks of unknown words are dropped, and the case is put back.
+ * </ol>
+ *
+ * A text in which Apertium knew no word (and the memory none) is not translated (null).
  */
 public final class ApertiumTranslator implements Translator {
-  private static final long TIMEOUT_MILLIS = 120_000;
+  /** How long one text may take; a hung Apertium is restarted after it, never waited for. */
+  static final long TIMEOUT_MILLIS = 30_000;
+  private static final long LIST_TIMEOUT_MILLIS = 120_000;
   private static final Pattern MARK = Pattern.compile("(?<![\\p{L}\\p{N}])[*#@](?=[\\p{L}\\p{N}])");
   private static final Pattern UNKNOWN =
       Pattern.compile("(?<![\\p{L}\\p{N}])\\*(?=[\\p{L}\\p{N}])");
+  /** Numbers, times, prices and hours, kept as written: "9:30", "10am", "£5.50", "24h". */
+  private static final Pattern NUMBER = Pattern.compile(
+      "(?<![\\p{L}\\p{N}])[£$€]?\\d[\\d:.,/]*(?:\\s?(?:[ap]\\.?m\\.?|h|hrs?)(?![\\p{L}]))?",
+      Pattern.CASE_INSENSITIVE);
+  private static final Pattern EDGE = Pattern.compile("^[^\\p{L}\\p{N}]*|[^\\p{L}\\p{N}]*$");
 
   private final String mode;
+  private final Language to;
+  private final SignMemory memory;
+  private final SignRules rules;
+  private final ApertiumPipeline pipeline;
 
-  /** Checks that apertium and a mode from {@code from} to {@code to} are installed. */
+  /**
+   * Checks that apertium and a mode from {@code from} to {@code to} are installed and starts it;
+   * the memory is the pair's file in the directory named by the property translate.memory.
+   */
   public ApertiumTranslator(Language from, Language to) throws HostException {
-    List<String> modes = installedModes(from, to);
-    mode = ApertiumPairs.chooseMode(modes, from, to);
+    this(from, to, memoryOf(from, to), TIMEOUT_MILLIS, System.err);
+  }
+
+  ApertiumTranslator(Language from, Language to, SignMemory memory, long timeoutMillis,
+      PrintStream log) throws HostException {
+    mode = ApertiumPairs.chooseMode(installedModes(from, to), from, to);
     if (mode == null) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION, ApertiumPairs.missingPair(from, to));
     }
+    this.to = to;
+    this.memory = memory;
+    this.rules = SignRules.forPair(from, to);
+    this.pipeline = ApertiumPipeline.start(mode, timeoutMillis, log);
+  }
+
+  /** The pair's memory file in the directory of the property translate.memory, if there is one. */
+  static SignMemory memoryOf(Language from, Language to) throws HostException {
+    String directory = System.getProperty("translate.memory");
+    if (directory == null) {
+      return SignMemory.EMPTY;
+    }
+    Path file = Path.of(directory, from.iso + "-" + to.iso + ".tmx");
+    return Files.exists(file) ? SignMemory.read(file, from.iso, to.iso) : SignMemory.EMPTY;
   }
 
   @Override
   public String name() {
-    return "apertium " + mode;
+    return "apertium " + mode + (memory.size() > 0 ? " with " + memory.name() : "");
   }
 
   @Override
   public List<String> translate(List<String> lines) throws HostException {
-    if (lines.isEmpty()) {
-      return List.of();
-    }
-    List<String> paragraphs = paragraphs(run(String.join("\n\n", oneLineEach(lines)) + "\n"));
-    if (paragraphs.size() != lines.size()) {
-      // A line Apertium split or joined after all: ask line by line rather than misplace text.
-      paragraphs = new ArrayList<>();
-      for (String line : oneLineEach(lines)) {
-        paragraphs.add(String.join(" ", paragraphs(run(line + "\n"))));
-      }
-    }
-    List<String> translations = new ArrayList<>();
-    for (String paragraph : paragraphs) {
-      translations.add(unmarked(paragraph));
+    List<String> translations = new ArrayList<>(lines.size());
+    for (String line : lines) {
+      translations.add(translateOne(line));
     }
     return translations;
   }
 
-  private String run(String text) throws HostException {
-    ChildProcess.Result result;
-    try {
-      result = ChildProcess.run(
-          "translation", List.of("apertium", mode), text, Map.of(), TIMEOUT_MILLIS);
-    } catch (IOException e) {
-      throw new HostException(ExitStatus.MISSING_TRANSLATION,
-          "cannot run apertium: install the Debian package apertium");
+  @Override
+  public void close() {
+    pipeline.close();
+  }
+
+  /** The running pipeline, for tests that stop a part of it. */
+  ApertiumPipeline pipeline() {
+    return pipeline;
+  }
+
+  private String translateOne(String line) throws HostException {
+    String flat = line.replaceAll("\\s+", " ").strip();
+    if (flat.isEmpty()) {
+      return null;
     }
-    if (result.exitCode != 0) {
-      throw new HostException(ExitStatus.CHILD_FAILED,
-          "apertium " + mode + " failed (exit " + result.exitCode + "): " + result.lastErrorLine());
+    CaseStyle style = CaseStyle.of(flat);
+    String source = style.forTranslation(flat);
+    String translation = wholeFromMemory(source);
+    if (translation == null) {
+      SignRules.Edit edit = rules.edit(source);
+      List<SignMemory.Match> known = memory.find(edit.text);
+      String output = StreamFormat.plain(pipeline.translate(segment(edit.text, known), edit));
+      String plain = unmarked(output);
+      if (plain == null && !known.isEmpty()) {
+        plain = MARK.matcher(output.replaceAll("\\s+", " ").strip()).replaceAll("");
+      }
+      translation = edit.finish(plain);
     }
-    return result.stdout;
+    return style.apply(translation, flat, to.iso);
+  }
+
+  /** The memory's translation of the whole text, with the text's own punctuation around it. */
+  private String wholeFromMemory(String source) {
+    String known = memory.whole(source);
+    if (known == null) {
+      return null;
+    }
+    Matcher edges = EDGE.matcher(source);
+    String lead = edges.find() ? edges.group() : "";
+    String trail = edges.find() ? edges.group() : "";
+    boolean punctuated = !known.isEmpty()
+        && !Character.isLetterOrDigit(known.codePointBefore(known.length()));
+    return lead + known + (punctuated ? "" : trail);
+  }
+
+  /** One segment in stream format: memory translations and numbers as superblanks. */
+  private static String segment(String text, List<SignMemory.Match> known) {
+    StringBuilder out = new StringBuilder();
+    int done = 0;
+    for (SignMemory.Match match : known) {
+      protectNumbers(out, text.substring(done, match.start));
+      out.append(StreamFormat.superblank(caseOfPlace(text, match)));
+      done = match.end;
+    }
+    protectNumbers(out, text.substring(done));
+    return out.append(StreamFormat.SEGMENT_END).toString();
+  }
+
+  /** A memory translation starts with a capital where its source did. */
+  private static String caseOfPlace(String text, SignMemory.Match match) {
+    boolean upper = Character.isUpperCase(text.codePointAt(match.start));
+    return upper ? SignRules.upperFirst(match.translation) : SignRules.lowerFirst(match.translation);
+  }
+
+  private static void protectNumbers(StringBuilder out, String text) {
+    Matcher m = NUMBER.matcher(text);
+    int done = 0;
+    while (m.find()) {
+      out.append(StreamFormat.escape(text.substring(done, m.start())))
+          .append(StreamFormat.superblank(m.group()));
+      done = m.end();
+    }
+    out.append(StreamFormat.escape(text.substring(done)));
   }
 
   private static List<String> installedModes(Language from, Language to) throws HostException {
     ChildProcess.Result result;
     try {
-      result =
-          ChildProcess.run("translation", List.of("apertium", "-l"), "", Map.of(), TIMEOUT_MILLIS);
+      result = ChildProcess.run(
+          "translation", List.of("apertium", "-l"), "", Map.of(), LIST_TIMEOUT_MILLIS);
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "Apertium is not installed: install the Debian packages apertium and "
@@ -97,27 +186,11 @@ public final class ApertiumTranslator implements Translator {
     return modes;
   }
 
-  private static List<String> oneLineEach(List<String> lines) {
-    List<String> flat = new ArrayList<>();
-    for (String line : lines) {
-      flat.add(line.replaceAll("\\s+", " ").strip());
-    }
-    return flat;
-  }
-
-  private static List<String> paragraphs(String output) {
-    List<String> paragraphs = new ArrayList<>();
-    for (String paragraph : output.strip().split("\\n\\s*\\n")) {
-      paragraphs.add(paragraph.replaceAll("\\s+", " ").strip());
-    }
-    return paragraphs;
-  }
-
-  /** The paragraph without Apertium's marks; null when no word of it was known. */
-  static String unmarked(String paragraph) {
+  /** The text without Apertium's marks; null when no word of it was known. */
+  static String unmarked(String text) {
     int known = 0;
-    StringBuilder text = new StringBuilder();
-    for (String word : paragraph.split(" ")) {
+    StringBuilder out = new StringBuilder();
+    for (String word : text.strip().split("\\s+")) {
       if (word.isEmpty()) {
         continue;
       }
@@ -127,8 +200,8 @@ public final class ApertiumTranslator implements Translator {
           && plain.codePoints().anyMatch(Character::isLetterOrDigit)) {
         ++known;
       }
-      text.append(text.length() == 0 ? "" : " ").append(plain);
+      out.append(out.length() == 0 ? "" : " ").append(plain);
     }
-    return known == 0 ? null : text.toString();
+    return known == 0 ? null : out.toString();
   }
 }

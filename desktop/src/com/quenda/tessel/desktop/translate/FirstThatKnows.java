@@ -46,6 +46,13 @@ public final class FirstThatKnows implements Translator {
   }
 
   @Override
+  public void close() {
+    for (Translator backEnd : backEnds) {
+      backEnd.close();
+    }
+  }
+
+  @Override
   public String name() {
     List<String> names = new ArrayList<>();
     for (Translator backEnd : backEnds) {

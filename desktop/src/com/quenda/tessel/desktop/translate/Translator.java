@@ -4,16 +4,21 @@ import com.quenda.tessel.desktop.HostException;
 import java.util.List;
 
 /**
- * A machine-translation back-end. All lines of one image go in one call, so a back-end that starts
- * a process or loads a model pays for it once per image, not once per line.
+ * A machine-translation back-end. All texts of one image go in one call; a back-end that keeps a
+ * process or a model loads it once per run, and {@link #close} releases it.
  */
-public interface Translator {
+public interface Translator extends AutoCloseable {
   /**
-   * The translation of each line, in order; null where the back-end could not translate a line
-   * (the host then keeps that line's original text). Throws only when the back-end itself failed.
+   * The translation of each text, in order, each translated on its own; null where the back-end
+   * could not translate a text (the host then keeps its original). Throws only when the back-end
+   * itself failed.
    */
   List<String> translate(List<String> lines) throws HostException;
 
   /** A short name for reports, such as "apertium eng-spa". */
   String name();
+
+  /** Stops whatever the back-end keeps running; nothing by default. */
+  @Override
+  default void close() {}
 }
