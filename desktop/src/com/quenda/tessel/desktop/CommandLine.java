@@ -9,9 +9,12 @@ public final class CommandLine {
   public static final String USAGE = String.join("\n",
       "usage: translate.sh photo IMAGE... --from LANG --to LANG --out DIR [options]",
       "       translate.sh video VIDEO_OR_FRAME_FOLDER --from LANG --to LANG --out DIR [--live]",
-      "", "Finds the text, translates it and draws the translation in place. photo writes",
+      "       translate.sh text --from LANG --to LANG [--translations FILE]", "",
+      "Finds the text, translates it and draws the translation in place. photo writes",
       "DIR/NAME.png (translated), DIR/NAME.compare.png (before | after) and DIR/NAME.json;",
-      "video writes DIR/NAME.mp4 (or .avi), DIR/NAME.preview.gif and DIR/NAME.json.", "",
+      "video writes DIR/NAME.mp4 (or .avi), DIR/NAME.preview.gif and DIR/NAME.json.",
+      "text reads standard input, one text per line, and prints one translation per line",
+      "(an empty line for an empty line, the original where nothing could be translated).", "",
       "  --from LANG          language of the text in the images (ISO 639-1, default en)",
       "  --to LANG            language to translate into (ISO 639-1, default es)",
       "  --out DIR            output directory (default out), created when missing",
@@ -48,8 +51,8 @@ public final class CommandLine {
       throw usage("no mode given");
     }
     String mode = args[0];
-    if (!mode.equals("photo") && !mode.equals("video")) {
-      throw usage("unknown mode '" + mode + "' (expected photo or video)");
+    if (!mode.equals("photo") && !mode.equals("video") && !mode.equals("text")) {
+      throw usage("unknown mode '" + mode + "' (expected photo, video or text)");
     }
     List<Path> inputs = new ArrayList<>();
     String from = "en";
@@ -87,7 +90,10 @@ public final class CommandLine {
       }
     }
     boolean video = mode.equals("video");
-    if (inputs.isEmpty()) {
+    if (mode.equals("text") && !inputs.isEmpty()) {
+      throw usage("text reads standard input, not " + inputs.get(0));
+    }
+    if (inputs.isEmpty() && !mode.equals("text")) {
       throw usage(video ? "no video or frame folder given" : "no input image given");
     }
     if (video && inputs.size() > 1) {

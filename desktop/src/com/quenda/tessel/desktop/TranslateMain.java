@@ -1,6 +1,7 @@
 package com.quenda.tessel.desktop;
 
 import com.quenda.tessel.desktop.photo.PhotoCommand;
+import com.quenda.tessel.desktop.text.TextCommand;
 import com.quenda.tessel.desktop.video.VideoCommand;
 import java.io.FileNotFoundException;
 import java.io.FileOutputStream;
@@ -47,6 +48,9 @@ public final class TranslateMain {
     }
     try {
       CommandLine command = CommandLine.parse(args);
+      if (command.mode.equals("text")) {
+        return TextCommand.run(command, System.in, out, err);
+      }
       System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
       if (command.mode.equals("video")) {
         VideoCommand.run(command, out, err);
