@@ -27,8 +27,8 @@ public final class TextCommand {
   private TextCommand() {}
 
   /** Translates {@code in} to {@code out}; the status is OK or NOT_AN_IMAGE (bad input data). */
-  public static ExitStatus run(CommandLine command, InputStream in, PrintStream out,
-      PrintStream err) throws HostException {
+  public static ExitStatus run(
+      CommandLine command, InputStream in, PrintStream out, PrintStream err) throws HostException {
     int bad = 0;
     try (Translator translator =
              Translators.create(command.from, command.to, command.translations)) {

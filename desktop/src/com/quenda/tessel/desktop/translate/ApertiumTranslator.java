@@ -132,8 +132,8 @@ public final class ApertiumTranslator implements Translator {
     Matcher edges = EDGE.matcher(source);
     String lead = edges.find() ? edges.group() : "";
     String trail = edges.find() ? edges.group() : "";
-    boolean punctuated = !known.isEmpty()
-        && !Character.isLetterOrDigit(known.codePointBefore(known.length()));
+    boolean punctuated =
+        !known.isEmpty() && !Character.isLetterOrDigit(known.codePointBefore(known.length()));
     return lead + known + (punctuated ? "" : trail);
   }
 
@@ -153,7 +153,8 @@ public final class ApertiumTranslator implements Translator {
   /** A memory translation starts with a capital where its source did. */
   private static String caseOfPlace(String text, SignMemory.Match match) {
     boolean upper = Character.isUpperCase(text.codePointAt(match.start));
-    return upper ? SignRules.upperFirst(match.translation) : SignRules.lowerFirst(match.translation);
+    return upper ? SignRules.upperFirst(match.translation)
+                 : SignRules.lowerFirst(match.translation);
   }
 
   private static void protectNumbers(StringBuilder out, String text) {

@@ -79,7 +79,7 @@ enum CaseStyle {
                             .filter(Character::isLetter)
                             .limit(1)
                             .anyMatch(Character::isUpperCase);
-        return upper ? SignRules.upperFirst(translation) : translation;
+        return upper ? SignRules.upperFirst(translation) : SignRules.lowerFirst(translation);
     }
   }
 
@@ -92,8 +92,8 @@ enum CaseStyle {
       String word = m.group();
       // Words in capitals inside a title are acronyms ("WC", "ATM"): kept.
       boolean acronym = word.length() > 1 && word.equals(word.toUpperCase(Locale.ROOT));
-      m.appendReplacement(out, Matcher.quoteReplacement(
-          first || acronym ? word : SignRules.lowerFirst(word)));
+      m.appendReplacement(
+          out, Matcher.quoteReplacement(first || acronym ? word : SignRules.lowerFirst(word)));
       first = false;
     }
     m.appendTail(out);
@@ -106,8 +106,9 @@ enum CaseStyle {
     while (m.find()) {
       String word = m.group();
       boolean first = m.start() == 0 || out.length() == 0;
-      m.appendReplacement(out, Matcher.quoteReplacement(
-          first || word.length() >= 4 ? SignRules.upperFirst(word) : word));
+      m.appendReplacement(out,
+          Matcher.quoteReplacement(
+              first || word.length() >= 4 ? SignRules.upperFirst(word) : word));
     }
     m.appendTail(out);
     return out.toString();

@@ -85,6 +85,9 @@ final class NullFlushProcess implements AutoCloseable {
   }
 
   private String askOnce(String input) throws Failure, HostException {
+    if (process != null && !process.isAlive()) {
+      throw new Failure("stopped" + exitDescription(process));
+    }
     Process running = process();
     BlockingQueue<Object> queue = answers;
     try {

@@ -79,8 +79,8 @@ final class SignMemory {
       SAXParser parser = factory.newSAXParser();
       parser.parse(Files.newInputStream(file), handler);
     } catch (SAXParseException e) {
-      throw new HostException(ExitStatus.USAGE,
-          String.format("%s:%d: %s", file, e.getLineNumber(), e.getMessage()));
+      throw new HostException(
+          ExitStatus.USAGE, String.format("%s:%d: %s", file, e.getLineNumber(), e.getMessage()));
     } catch (SAXException | ParserConfigurationException e) {
       throw new HostException(ExitStatus.USAGE, file + ": " + e.getMessage());
     } catch (IOException e) {

@@ -233,7 +233,8 @@ final class SignRules {
     }
     List<String> after = LexicalUnits.readings(next);
     boolean adjective = first.stream().anyMatch(r -> r.contains("<adj>"));
-    boolean objectFollows = after.stream().anyMatch(r -> r.contains("<det>") || r.contains("<prn>"));
+    boolean objectFollows =
+        after.stream().anyMatch(r -> r.contains("<det>") || r.contains("<prn>"));
     return !adjective || objectFollows;
   }
 
@@ -282,7 +283,8 @@ final class SignRules {
       return text;
     }
     int first = text.codePointAt(0);
-    return new StringBuilder().appendCodePoint(Character.toLowerCase(first))
+    return new StringBuilder()
+        .appendCodePoint(Character.toLowerCase(first))
         .append(text.substring(Character.charCount(first)))
         .toString();
   }
@@ -292,7 +294,8 @@ final class SignRules {
       return text;
     }
     int first = text.codePointAt(0);
-    return new StringBuilder().appendCodePoint(Character.toUpperCase(first))
+    return new StringBuilder()
+        .appendCodePoint(Character.toUpperCase(first))
         .append(text.substring(Character.charCount(first)))
         .toString();
   }
