@@ -105,8 +105,10 @@ class BadInputTest {
   void commandLineMistakesAreUsageErrors() throws IOException {
     String hint = " (translate.sh --help for usage)";
     assertFails(run("film", good.toString()), ExitStatus.USAGE,
-        "unknown mode 'film' (expected photo or video)" + hint);
+        "unknown mode 'film' (expected photo, video or text)" + hint);
     assertFails(run("photo"), ExitStatus.USAGE, "no input image given" + hint);
+    assertFails(run("text", good.toString()), ExitStatus.USAGE,
+        "text reads standard input, not " + good + hint);
     assertFails(run("photo", good.toString(), "--to", "xx"), ExitStatus.USAGE,
         "--to: unknown language code 'xx' (known: " + Language.knownCodes() + ")" + hint);
     assertFails(run("photo", good.toString(), "--colour"), ExitStatus.USAGE,

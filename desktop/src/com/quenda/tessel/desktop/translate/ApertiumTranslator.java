@@ -40,6 +40,9 @@ public final class ApertiumTranslator implements Translator {
   private static final Pattern NUMBER = Pattern.compile(
       "(?<![\\p{L}\\p{N}])[£$€]?\\d[\\d:.,/]*(?:\\s?(?:[ap]\\.?m\\.?|h|hrs?)(?![\\p{L}]))?",
       Pattern.CASE_INSENSITIVE);
+  /** A capital Apertium put after protected text, as if a sentence started there. */
+  private static final Pattern CAPITAL_AFTER_BLANK =
+      Pattern.compile("(?<=[^\\[]\\])(\\s*)(\\p{Lu}[\\p{Ll}\\p{M}]+)");
   private static final Pattern EDGE = Pattern.compile("^[^\\p{L}\\p{N}]*|[^\\p{L}\\p{N}]*$");
 
   private final String mode;
@@ -113,7 +116,11 @@ public final class ApertiumTranslator implements Translator {
     if (translation == null) {
       SignRules.Edit edit = rules.edit(source);
       List<SignMemory.Match> known = memory.find(edit.text);
-      String output = StreamFormat.plain(pipeline.translate(segment(edit.text, known), edit));
+      // Apertium's own text reader ends every text with a full stop, and its tagger is trained on
+      // what that gives; the stop is added here too and taken back off.
+      String stream = pipeline.translate(segment(edit.text + ".", known), edit);
+      String output = StreamFormat.plain(lowerAfterProtected(stream, edit.text)).strip();
+      output = output.endsWith(".") ? output.substring(0, output.length() - 1) : output;
       String plain = unmarked(output);
       if (plain == null && !known.isEmpty()) {
         plain = MARK.matcher(output.replaceAll("\\s+", " ").strip()).replaceAll("");
@@ -121,6 +128,23 @@ public final class ApertiumTranslator implements Translator {
       translation = edit.finish(plain);
     }
     return style.apply(translation, flat, to.iso);
+  }
+
+  /**
+   * Apertium starts a sentence after a superblank; the word there keeps its capital only when the
+   * source has it with one (a name left untranslated).
+   */
+  private static String lowerAfterProtected(String stream, String source) {
+    Matcher m = CAPITAL_AFTER_BLANK.matcher(stream);
+    StringBuilder out = new StringBuilder();
+    while (m.find()) {
+      String word = m.group(2);
+      boolean name = Pattern.compile("\\b" + Pattern.quote(word) + "\\b").matcher(source).find();
+      m.appendReplacement(
+          out, Matcher.quoteReplacement(m.group(1) + (name ? word : SignRules.lowerFirst(word))));
+    }
+    m.appendTail(out);
+    return out.toString();
   }
 
   /** The memory's translation of the whole text, with the text's own punctuation around it. */

@@ -32,7 +32,8 @@ final class NullFlushProcess implements AutoCloseable {
   private final PrintStream log;
   private volatile Process process;
   private BlockingQueue<Object> answers;
-  private final StringBuilder lastError = new StringBuilder();
+  /** What the running program wrote on standard error (its last 4 KiB); one per start. */
+  private StringBuilder lastError = new StringBuilder();
   private final Thread shutdownHook = new Thread(this::stop);
   private boolean hooked;
 
@@ -57,9 +58,11 @@ final class NullFlushProcess implements AutoCloseable {
     try {
       return askOnce(input);
     } catch (Failure e) {
+      // What the program said before it is stopped, not the shell's word on the stopping.
+      String said = lastErrorLine();
       stop();
-      throw new HostException(ExitStatus.CHILD_FAILED,
-          name + " " + e.getMessage() + " again after a restart" + lastErrorLine());
+      throw new HostException(
+          ExitStatus.CHILD_FAILED, name + " " + e.getMessage() + " again after a restart" + said);
     }
   }
 
@@ -123,11 +126,9 @@ final class NullFlushProcess implements AutoCloseable {
           "cannot run " + command.get(0) + ": install the Debian package apertium");
     }
     answers = new LinkedBlockingQueue<>();
-    synchronized (lastError) {
-      lastError.setLength(0);
-    }
+    lastError = new StringBuilder();
     readAnswers(process.getInputStream(), answers);
-    readErrors(process.getErrorStream());
+    readErrors(process.getErrorStream(), lastError);
     if (!hooked) {
       Runtime.getRuntime().addShutdownHook(shutdownHook);
       hooked = true;
@@ -174,7 +175,7 @@ final class NullFlushProcess implements AutoCloseable {
     reader.start();
   }
 
-  private void readErrors(InputStream stream) {
+  private static void readErrors(InputStream stream, StringBuilder lastError) {
     Thread reader = new Thread(() -> {
       byte[] buffer = new byte[4096];
       try (InputStream in = stream) {
@@ -195,8 +196,9 @@ final class NullFlushProcess implements AutoCloseable {
   }
 
   private String lastErrorLine() {
-    synchronized (lastError) {
-      String[] lines = lastError.toString().strip().split("\n");
+    StringBuilder errors = lastError;
+    synchronized (errors) {
+      String[] lines = errors.toString().strip().split("\n");
       String last = lines[lines.length - 1].strip();
       return last.isEmpty() ? "" : ": " + last;
     }

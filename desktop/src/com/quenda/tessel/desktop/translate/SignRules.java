@@ -40,6 +40,7 @@ final class SignRules {
       Pattern.compile("<(?:pri|imp|prs|ifi|fti|pii|cni|inf)>(?:<p[123]>)?(?:<(?:sg|pl)>)?");
   private static final Pattern SECOND_PERSON_VERB =
       Pattern.compile("<(pri|imp|prs|ifi|fti|pii|cni)><p2><(?:sg|pl)>");
+  static final Pattern PUNCTUATION = Pattern.compile("<(?:sent|cm|lpar|rpar|lquest|guio)>");
   private static final Pattern VERB = Pattern.compile("<(?:vblex|vbser|vbhaver|vbmod|vaux)>");
   private static final Pattern SPANISH_FAMILIAR_POSSESSIVE =
       Pattern.compile("^(?i:vuestro|tu)<det><pos>(?:<[mf]+>)?<(sg|pl)>(.*)$");
@@ -49,6 +50,12 @@ final class SignRules {
   /** The words a target puts before a polite request. */
   private static final Map<String, String> PLEASE =
       Map.of("es", "Por favor, ", "gl", "Por favor, ", "ca", "Si us plau, ");
+  /**
+   * Words of British signs whose sign sense Apertium's dictionary gives only under another
+   * English word: the lift is a machine, not a push.
+   */
+  private static final Map<String, String> SIGN_SYNONYMS = Map.of("lift<n>", "elevator<n>");
+
   /** The definite article's lemma, for "Prohibida la entrada". */
   private static final Map<String, String> ARTICLE = Map.of("es", "el", "gl", "o", "ca", "el");
 
@@ -75,6 +82,7 @@ final class SignRules {
     final String text;
     private boolean polite;
     private final boolean endsWithOnly;
+    private final boolean sentence;
     private boolean command;
     private boolean prohibitsDoing;
     private boolean prohibitsThing;
@@ -95,6 +103,7 @@ final class SignRules {
       }
       this.text = text;
       this.endsWithOnly = active && ONLY_LAST.matcher(text).find();
+      this.sentence = text.matches(".*[.!]\\s*$");
     }
 
     /** After morphological analysis: chooses the readings a sign means. */
@@ -104,18 +113,30 @@ final class SignRules {
       }
       LexicalUnits units = new LexicalUnits(stream);
       for (int i = 0; i < units.size(); i++) {
-        preferParticiple(units, i);
+        if (i == 0 || hasReading(units.get(i - 1), "<n>")) {
+          preferParticiple(units, i);
+        }
+        units.set(i, signSense(units.get(i)));
       }
-      if (units.size() == 0) {
-        return stream;
+      // Text the memory translated opens the line: what follows it does not start the sign.
+      if (units.size() == 0 || units.pieces.get(0).matches("^\\[.+")) {
+        return stream.equals(units.toString()) ? stream : units.toString();
       }
       List<String> first = LexicalUnits.readings(units.get(0));
-      String next = units.size() > 1 ? units.get(1) : null;
+      String next =
+          units.size() > 1 && !PUNCTUATION.matcher(units.get(1)).find() ? units.get(1) : null;
       if (LexicalUnits.surface(units.get(0)).equalsIgnoreCase("no") && next != null) {
         readProhibition(units, next);
       } else if (readsAsCommand(first, next)) {
         command = true;
         keepReadings(units, 0, "<inf>", "<vbdo>");
+        // "Take a number and wait": a verb after "and" or "or" continues the command.
+        for (int i = 2; i < units.size(); i++) {
+          if (hasReading(units.get(i - 1), "<cnjcoo>")
+              && hasReading(units.get(i), "<vblex><inf>")) {
+            keepReadings(units, i, "<inf>");
+          }
+        }
       }
       return units.toString();
     }
@@ -127,15 +148,22 @@ final class SignRules {
       }
       LexicalUnits units = new LexicalUnits(stream);
       boolean verbSet = !command;
+      // A request, or a command written as a sentence, speaks to the reader (usted); a bare sign
+      // states the rule (infinitive).
+      String form = polite || sentence ? "<prs><p3><sg>" : "<inf>";
       for (int i = 0; i < units.size(); i++) {
         String unit = units.get(i);
-        if (!verbSet && VERB.matcher(unit).find() && FINITE.matcher(unit).find()) {
-          String form = polite ? "<prs><p3><sg>" : "<inf>";
+        boolean verb = VERB.matcher(unit).find() && FINITE.matcher(unit).find();
+        boolean continued = i > 0 && units.get(i - 1).contains("<cnjcoo>");
+        if (verb && (!verbSet || (command && continued))) {
           units.set(i, FINITE.matcher(unit).replaceFirst(form));
           verbSet = true;
         } else {
           units.set(i, formal(unit));
         }
+      }
+      if (target.equals("es")) {
+        units = SpanishSignUsage.apply(units);
       }
       if (prohibitsDoing || prohibitsThing) {
         prohibit(units);
@@ -221,6 +249,22 @@ final class SignRules {
     }
   }
 
+  /** The sign sense of an ambiguous English word, given as the word that has it alone. */
+  private static String signSense(String unit) {
+    for (Map.Entry<String, String> synonym : SIGN_SYNONYMS.entrySet()) {
+      String word = synonym.getKey().substring(0, synonym.getKey().indexOf('<'));
+      String tags = synonym.getKey().substring(word.length());
+      String sense = synonym.getValue().substring(0, synonym.getValue().indexOf('<'));
+      Matcher m = Pattern.compile("/(?i:" + word + ")" + Pattern.quote(tags)).matcher(unit);
+      if (m.find()) {
+        boolean capital = Character.isUpperCase(unit.charAt(m.start() + 1));
+        return m.replaceAll(
+            Matcher.quoteReplacement("/" + (capital ? upperFirst(sense) : sense) + tags));
+      }
+    }
+    return unit;
+  }
+
   /** A line starting with a verb (and not an adjective before a number, "Open 9-5") commands. */
   private static boolean readsAsCommand(List<String> first, String next) {
     boolean verb = first.stream().anyMatch(r -> r.contains("<vblex><inf>") || r.contains("<vbdo>"));
@@ -236,6 +280,11 @@ final class SignRules {
     boolean objectFollows =
         after.stream().anyMatch(r -> r.contains("<det>") || r.contains("<prn>"));
     return !adjective || objectFollows;
+  }
+
+  private static boolean hasReading(String unit, String tag) {
+    return LexicalUnits.readings(unit).stream().anyMatch(r -> r.contains(tag))
+        || (unit.indexOf('/') < 0 && unit.contains(tag));
   }
 
   private static void preferParticiple(LexicalUnits units, int i) {
@@ -274,6 +323,9 @@ final class SignRules {
       if (SPANISH_FAMILIAR_PRONOUN.matcher(formal).matches()) {
         return "prpers<prn><tn><p3><mf><sg>";
       }
+      // Clitics: "te" becomes "le".
+      formal = formal.replaceFirst(
+          "^prpers<prn><(pro|enc)><p2><mf><(sg|pl)>", "prpers<prn><$1><p3><mf><sg>");
     }
     return formal;
   }
