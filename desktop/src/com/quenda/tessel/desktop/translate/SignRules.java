@@ -42,10 +42,16 @@ final class SignRules {
       Pattern.compile("<(pri|imp|prs|ifi|fti|pii|cni)><p2><(?:sg|pl)>");
   static final Pattern PUNCTUATION = Pattern.compile("<(?:sent|cm|lpar|rpar|lquest|guio)>");
   private static final Pattern VERB = Pattern.compile("<(?:vblex|vbser|vbhaver|vbmod|vaux)>");
-  private static final Pattern SPANISH_FAMILIAR_POSSESSIVE =
-      Pattern.compile("^(?i:vuestro|tu)<det><pos>(?:<[mf]+>)?<(sg|pl)>(.*)$");
-  private static final Pattern SPANISH_FAMILIAR_PRONOUN =
-      Pattern.compile("^(?i:ti|vosotros)<prn><tn><p2>.*$");
+  /** The reader's familiar possessive in each target, and the formal one that replaces it. */
+  private static final Map<String, Pattern> FAMILIAR_POSSESSIVE =
+      Map.of("es", Pattern.compile("^(?i:vuestro|tu)<det><pos>(?:<[mf]+>)?<(sg|pl)>(.*)$"), "ca",
+          Pattern.compile("^(?i:el vostre|el teu)<det><pos>(.*)$"), "gl",
+          Pattern.compile("^(?i:o voso|o teu)<det><pos>(.*)$"));
+  private static final Map<String, String> FORMAL_POSSESSIVE = Map.of(
+      "es", "suyo<det><pos><mf><$1>$2", "ca", "el seu<det><pos>$1", "gl", "o seu<det><pos>$1");
+  /** "ti", "vosotros", "tu": the reader as a stressed pronoun ("con usted", "amb vostè"). */
+  private static final Pattern FAMILIAR_PRONOUN =
+      Pattern.compile("^(?i:ti|vosotros|prpers)<prn><tn><p2>.*$");
 
   /** The words a target puts before a polite request. */
   private static final Map<String, String> PLEASE =
@@ -315,19 +321,16 @@ final class SignRules {
   /** A transferred unit in the formal register: third person for the reader. */
   private String formal(String unit) {
     String formal = SECOND_PERSON_VERB.matcher(unit).replaceAll("<$1><p3><sg>");
-    if (target.equals("es")) {
-      Matcher possessive = SPANISH_FAMILIAR_POSSESSIVE.matcher(formal);
-      if (possessive.matches()) {
-        return "suyo<det><pos><mf><" + possessive.group(1) + ">" + possessive.group(2);
-      }
-      if (SPANISH_FAMILIAR_PRONOUN.matcher(formal).matches()) {
-        return "prpers<prn><tn><p3><mf><sg>";
-      }
-      // Clitics: "te" becomes "le".
-      formal = formal.replaceFirst(
-          "^prpers<prn><(pro|enc)><p2><mf><(sg|pl)>", "prpers<prn><$1><p3><mf><sg>");
+    Matcher possessive = FAMILIAR_POSSESSIVE.get(target).matcher(formal);
+    if (possessive.matches()) {
+      return possessive.replaceFirst(FORMAL_POSSESSIVE.get(target));
     }
-    return formal;
+    if (FAMILIAR_PRONOUN.matcher(formal).matches()) {
+      return "prpers<prn><tn><p3><mf><sg>";
+    }
+    // Clitics: "te" becomes "le".
+    return formal.replaceFirst(
+        "^prpers<prn><(pro|enc)><p2><mf><(sg|pl)>", "prpers<prn><$1><p3><mf><sg>");
   }
 
   static String lowerFirst(String text) {

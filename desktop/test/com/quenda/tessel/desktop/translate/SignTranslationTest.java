@@ -67,6 +67,36 @@ class SignTranslationTest {
   }
 
   @Test
+  void signUsageTheDictionaryMisses() throws HostException {
+    assertEquals("No entrar", es("Do not enter"));
+    assertTrue(es("Children under 12 go free.").contains(" menores de 12 años "),
+        es("Children under 12 go free."));
+    assertTrue(
+        es("Kids under 3 eat for free").endsWith(" gratis"), es("Kids under 3 eat for free"));
+    assertTrue(es("Dogs are not allowed in the park.").startsWith("No se admiten perros en "),
+        es("Dogs are not allowed in the park."));
+    assertTrue(es("Visitors must wear a badge.").contains(" deben "));
+    assertTrue(es("The lift is broken.").contains("ascensor"), es("The lift is broken."));
+  }
+
+  @Test
+  void catalanAndGalicianReadersAreAddressedFormallyToo() throws HostException {
+    Pattern familiar = Pattern.compile("\\b(vostres?|teus?|tu|vos[oa]s?|contigo|ti)\\b");
+    for (String to : List.of("ca", "gl")) {
+      try (ApertiumTranslator translator = new ApertiumTranslator(Language.of("en"),
+               Language.of(to), SignMemory.EMPTY, ApertiumTranslator.TIMEOUT_MILLIS,
+               new PrintStream(log, true, StandardCharsets.UTF_8))) {
+        List<String> out = translator.translate(
+            List.of("Keep your bags with you", "You must show your ticket.", "Please wait here"));
+        for (String text : out) {
+          assertFalse(familiar.matcher(text.toLowerCase()).find(), to + ": " + text);
+        }
+        assertTrue(out.get(2).startsWith(to.equals("ca") ? "Si us plau, " : "Por favor, "), to);
+      }
+    }
+  }
+
+  @Test
   void numbersAndTimesAreKeptAsWritten() throws HostException {
     String hours = es("Open 9am to 5:30pm");
     assertTrue(hours.contains("9am") && hours.contains("5:30pm"), hours);
