@@ -22,7 +22,7 @@ import java.util.regex.Pattern;
  *   <li>its case is noted and the text put in sentence case ({@link CaseStyle});
  *   <li>a text the memory knows whole is translated by the memory alone;
  *   <li>else the editing rules take their look ({@link SignRules}), and the text goes to Apertium
- *       as one segment, with known segments of the memory and numbers and times protected as
+ *       as one segment, with known segments of the memory and times protected as
  *       superblanks, so that Apertium translates around them;
  *   <li>Apertium's marks of unknown words are dropped, and the case is put back.
  * </ol>
@@ -36,10 +36,13 @@ public final class ApertiumTranslator implements Translator {
   private static final Pattern MARK = Pattern.compile("(?<![\\p{L}\\p{N}])[*#@](?=[\\p{L}\\p{N}])");
   private static final Pattern UNKNOWN =
       Pattern.compile("(?<![\\p{L}\\p{N}])\\*(?=[\\p{L}\\p{N}])");
-  /** Numbers, times, prices and hours, kept as written: "9:30", "10am", "£5.50", "24h". */
+  /**
+   * Times with "am" or "pm", kept as written: Apertium reads the "am" of "10am" as the verb
+   * ("10soy"). Other numbers, prices and times it keeps as written itself, and protecting them
+   * would let it move words across them.
+   */
   private static final Pattern NUMBER = Pattern.compile(
-      "(?<![\\p{L}\\p{N}])[£$€]?\\d[\\d:.,/]*(?:\\s?(?:[ap]\\.?m\\.?|h|hrs?)(?![\\p{L}]))?",
-      Pattern.CASE_INSENSITIVE);
+      "(?<![\\p{L}\\p{N}])\\d[\\d:.]*\\s?[ap]\\.?m\\b\\.?", Pattern.CASE_INSENSITIVE);
   /** A capital Apertium put after protected text, as if a sentence started there. */
   private static final Pattern CAPITAL_AFTER_BLANK =
       Pattern.compile("(?<=[^\\[]\\])(\\s*)(\\p{Lu}[\\p{Ll}\\p{M}]+)");
@@ -161,7 +164,7 @@ public final class ApertiumTranslator implements Translator {
     return lead + known + (punctuated ? "" : trail);
   }
 
-  /** One segment in stream format: memory translations and numbers as superblanks. */
+  /** One segment in stream format: memory translations and times as superblanks. */
   private static String segment(String text, List<SignMemory.Match> known) {
     StringBuilder out = new StringBuilder();
     int done = 0;

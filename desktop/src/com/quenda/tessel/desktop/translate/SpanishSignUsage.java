@@ -59,11 +59,19 @@ final class SpanishSignUsage {
     if (!protectedNumber && !number) {
       return;
     }
-    units.set(i, "menor<adj><mf><pl>");
+    boolean one = i > 0 && units.get(i - 1).matches(".*<n>.*<sg>");
+    units.set(i, one ? "menor<adj><mf><sg>" : "menor<adj><mf><pl>");
     // "de" goes right after "menores", before the blank that may hold the number.
     units.pieces.add(2 * i + 2, " ");
     units.pieces.add(2 * i + 3, "de<pr>");
-    units.insert(protectedNumber ? i + 2 : i + 3, "año<n><m><pl>");
+    int years = protectedNumber ? i + 2 : i + 3;
+    units.insert(years, "año<n><m><pl>");
+    // The verb agrees with the people, not with the number: "Niños menores de 3 años comen".
+    boolean people = i > 0 && units.get(i - 1).matches(".*<n>.*<pl>");
+    if (people && years + 1 < units.size()) {
+      units.set(
+          years + 1, units.get(years + 1).replaceFirst("<(pri|prs)><p3><sg>", "<$1><p3><pl>"));
+    }
   }
 
   /** "libre" after a verb, or after "para" after a verb, is "gratis". */
