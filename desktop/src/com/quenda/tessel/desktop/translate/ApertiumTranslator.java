@@ -45,7 +45,10 @@ public final class ApertiumTranslator implements Translator {
       "(?<![\\p{L}\\p{N}])\\d[\\d:.]*\\s?[ap]\\.?m\\b\\.?", Pattern.CASE_INSENSITIVE);
   /** A capital Apertium put after protected text, as if a sentence started there. */
   private static final Pattern CAPITAL_AFTER_BLANK =
-      Pattern.compile("(?<=[^\\[]\\])(\\s*)(\\p{Lu}[\\p{Ll}\\p{M}]+)");
+      Pattern.compile("(?<=[^\\[]\\])(\\s*(?:[*#@]\\S+\\s+)*)(\\p{Lu}[\\p{Ll}\\p{M}]+)");
+  /** A request after a comma or colon. */
+  private static final Pattern LATER_REQUEST =
+      Pattern.compile("([,;:]\\s*)(?=please\\s+\\p{L})", Pattern.CASE_INSENSITIVE);
   private static final Pattern EDGE = Pattern.compile("^[^\\p{L}\\p{N}]*|[^\\p{L}\\p{N}]*$");
 
   private final String mode;
@@ -113,12 +116,21 @@ public final class ApertiumTranslator implements Translator {
     if (flat.isEmpty()) {
       return null;
     }
+    Matcher request = LATER_REQUEST.matcher(flat);
+    if (request.find() && request.start() > 0) {
+      // "Wet floor, please walk carefully": the request is a sentence of its own.
+      String first = translateOne(flat.substring(0, request.start()));
+      String second = translateOne(flat.substring(request.end()));
+      if (first != null && second != null) {
+        return first + request.group(1) + SignRules.lowerFirst(second);
+      }
+    }
     CaseStyle style = CaseStyle.of(flat);
     String source = style.forTranslation(flat);
     String translation = wholeFromMemory(source);
     if (translation == null) {
       SignRules.Edit edit = rules.edit(source);
-      List<SignMemory.Match> known = memory.find(edit.text);
+      List<SignMemory.Match> known = knownInside(edit);
       // Apertium's own text reader ends every text with a full stop, and its tagger is trained on
       // what that gives; the stop is added here too and taken back off.
       String stream = pipeline.translate(segment(edit.text + ".", known), edit);
@@ -162,6 +174,20 @@ public final class ApertiumTranslator implements Translator {
     boolean punctuated =
         !known.isEmpty() && !Character.isLetterOrDigit(known.codePointBefore(known.length()));
     return lead + known + (punctuated ? "" : trail);
+  }
+
+  /**
+   * The memory's phrases inside the text. A request keeps its verb for the rules: the memory's
+   * commands are infinitives, and "Por favor, ..." needs the usted form.
+   */
+  private List<SignMemory.Match> knownInside(SignRules.Edit edit) {
+    List<SignMemory.Match> known = new ArrayList<>();
+    for (SignMemory.Match match : memory.find(edit.text)) {
+      if (!(edit.polite() && match.start == 0)) {
+        known.add(to.iso.equals("es") ? SpanishArticle.takeIn(edit.text, match) : match);
+      }
+    }
+    return known;
   }
 
   /** One segment in stream format: memory translations and times as superblanks. */

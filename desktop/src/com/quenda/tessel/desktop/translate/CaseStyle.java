@@ -1,6 +1,7 @@
 package com.quenda.tessel.desktop.translate;
 
 import java.util.Locale;
+import java.util.Set;
 import java.util.regex.Matcher;
 import java.util.regex.Pattern;
 
@@ -28,6 +29,11 @@ enum CaseStyle {
 
   private static final Pattern WORD = Pattern.compile("\\p{L}[\\p{L}\\p{N}'’]*");
   private static final String SENTENCE_CASE_LANGUAGES = "es ca gl fr it pt";
+  /** English words that keep their capital in any sentence: days and months. */
+  private static final Set<String> ALWAYS_CAPITALISED = Set.of("monday", "tuesday", "wednesday",
+      "thursday", "friday", "saturday", "sunday", "mondays", "tuesdays", "wednesdays", "thursdays",
+      "fridays", "saturdays", "sundays", "january", "february", "march", "april", "june", "july",
+      "august", "september", "october", "november", "december");
 
   static CaseStyle of(String text) {
     long letters = text.codePoints().filter(Character::isLetter).count();
@@ -90,10 +96,11 @@ enum CaseStyle {
     boolean first = true;
     while (m.find()) {
       String word = m.group();
-      // Words in capitals inside a title are acronyms ("WC", "ATM"): kept.
+      // Words in capitals inside a title are acronyms ("WC", "ATM"): kept, as are the words
+      // English always capitalises.
       boolean acronym = word.length() > 1 && word.equals(word.toUpperCase(Locale.ROOT));
-      m.appendReplacement(
-          out, Matcher.quoteReplacement(first || acronym ? word : SignRules.lowerFirst(word)));
+      boolean keep = first || acronym || ALWAYS_CAPITALISED.contains(word.toLowerCase(Locale.ROOT));
+      m.appendReplacement(out, Matcher.quoteReplacement(keep ? word : SignRules.lowerFirst(word)));
       first = false;
     }
     m.appendTail(out);

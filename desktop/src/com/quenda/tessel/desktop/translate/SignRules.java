@@ -1,8 +1,11 @@
 package com.quenda.tessel.desktop.translate;
 
 import com.quenda.tessel.desktop.Language;
+import java.util.HashSet;
 import java.util.List;
+import java.util.Locale;
 import java.util.Map;
+import java.util.Set;
 import java.util.regex.Matcher;
 import java.util.regex.Pattern;
 
@@ -93,6 +96,7 @@ final class SignRules {
     private boolean prohibitsDoing;
     private boolean prohibitsThing;
     private boolean plural;
+    private final Set<String> sourceWords = new HashSet<>();
 
     private Edit(String source) {
       String text = source;
@@ -112,6 +116,11 @@ final class SignRules {
       this.sentence = text.matches(".*[.!]\\s*$");
     }
 
+    /** Whether the text is a request ("Please ..."). */
+    boolean polite() {
+      return polite;
+    }
+
     /** After morphological analysis: chooses the readings a sign means. */
     String afterAnalysis(String stream) {
       if (!active) {
@@ -123,6 +132,7 @@ final class SignRules {
           preferParticiple(units, i);
         }
         units.set(i, signSense(units.get(i)));
+        sourceWords.add(LexicalUnits.surface(units.get(i)).toLowerCase(Locale.ROOT));
       }
       // Text the memory translated opens the line: what follows it does not start the sign.
       if (units.size() == 0 || units.pieces.get(0).matches("^\\[.+")) {
@@ -169,7 +179,7 @@ final class SignRules {
         }
       }
       if (target.equals("es")) {
-        units = SpanishSignUsage.apply(units);
+        units = SpanishSignUsage.apply(units, sourceWords);
       }
       if (prohibitsDoing || prohibitsThing) {
         prohibit(units);
