@@ -31,18 +31,21 @@ class TextCommandTest {
 
   @Test
   void oneLineOutPerLineInWithMemoryAndCase() throws HostException {
-    byte[] input =
-        "NO ENTRY\n\nlost property.\nplugh\nLeave the building in case of fire\n".getBytes(
-            StandardCharsets.UTF_8);
+    byte[] input = ("NO ENTRY\n\nlost property.\nplugh\nLeave the building in case of fire\n"
+        + "Guides wait at the main entrance.\nClosed On Sunday\n")
+                       .getBytes(StandardCharsets.UTF_8);
     assertEquals(ExitStatus.OK, run(input));
     List<String> lines = lines();
-    assertEquals(6, lines.size(), lines.toString());
+    assertEquals(8, lines.size(), lines.toString());
     assertEquals("PROHIBIDO EL PASO", lines.get(0));
     assertEquals("", lines.get(1));
     assertEquals("objetos perdidos.", lines.get(2));
     assertEquals("plugh", lines.get(3), "untranslatable: the original");
     assertTrue(lines.get(4).endsWith("en caso de incendio"), lines.get(4));
-    assertEquals("", lines.get(5));
+    // A feminine phrase of the memory takes its article; a title's day keeps its capital.
+    assertTrue(lines.get(5).endsWith(" en la entrada principal."), lines.get(5));
+    assertEquals("Cerrado el domingo", lines.get(6));
+    assertEquals("", lines.get(7));
   }
 
   @Test

@@ -80,6 +80,19 @@ class SignTranslationTest {
   }
 
   @Test
+  void notices() throws HostException {
+    assertTrue(es("The garden is open today.").contains(" está abierto "),
+        es("The garden is open today."));
+    assertTrue(es("The bar is on the roof.").contains(" está en "), es("The bar is on the roof."));
+    assertTrue(es("Maps are sold at the desk.").startsWith("Los mapas se venden "),
+        es("Maps are sold at the desk."));
+    assertEquals("Andén 4", es("Platform 4"));
+    String split = es("Slippery floor, please hold the rail");
+    assertTrue(split.contains(", por favor, ") && !split.contains("omplacer"), split);
+    assertEquals("ABIERTO HASTA LAS SEIS", es("OPEN UNTIL SIX"));
+  }
+
+  @Test
   void catalanAndGalicianReadersAreAddressedFormallyToo() throws HostException {
     Pattern familiar = Pattern.compile("\\b(vostres?|teus?|tu|vos[oa]s?|contigo|ti)\\b");
     for (String to : List.of("ca", "gl")) {
