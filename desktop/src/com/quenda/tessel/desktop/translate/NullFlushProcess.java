@@ -34,6 +34,7 @@ final class NullFlushProcess implements AutoCloseable {
   private BlockingQueue<Object> answers;
   /** What the running program wrote on standard error (its last 4 KiB); one per start. */
   private StringBuilder lastError = new StringBuilder();
+  private Thread errorReader;
   private final Thread shutdownHook = new Thread(this::stop);
   private boolean hooked;
 
@@ -59,7 +60,7 @@ final class NullFlushProcess implements AutoCloseable {
       return askOnce(input);
     } catch (Failure e) {
       // What the program said before it is stopped, not the shell's word on the stopping.
-      String said = lastErrorLine();
+      String said = lastErrorLine(process);
       stop();
       throw new HostException(
           ExitStatus.CHILD_FAILED, name + " " + e.getMessage() + " again after a restart" + said);
@@ -99,7 +100,7 @@ final class NullFlushProcess implements AutoCloseable {
       stdin.write(0);
       stdin.flush();
     } catch (IOException e) {
-      throw new Failure("stopped (its input is closed)");
+      throw new Failure("stopped" + exitDescription(running));
     }
     Object answer;
     try {
@@ -128,7 +129,7 @@ final class NullFlushProcess implements AutoCloseable {
     answers = new LinkedBlockingQueue<>();
     lastError = new StringBuilder();
     readAnswers(process.getInputStream(), answers);
-    readErrors(process.getErrorStream(), lastError);
+    errorReader = readErrors(process.getErrorStream(), lastError);
     if (!hooked) {
       Runtime.getRuntime().addShutdownHook(shutdownHook);
       hooked = true;
@@ -175,7 +176,7 @@ final class NullFlushProcess implements AutoCloseable {
     reader.start();
   }
 
-  private static void readErrors(InputStream stream, StringBuilder lastError) {
+  private static Thread readErrors(InputStream stream, StringBuilder lastError) {
     Thread reader = new Thread(() -> {
       byte[] buffer = new byte[4096];
       try (InputStream in = stream) {
@@ -193,9 +194,18 @@ final class NullFlushProcess implements AutoCloseable {
     }, "translator errors");
     reader.setDaemon(true);
     reader.start();
+    return reader;
   }
 
-  private String lastErrorLine() {
+  /** The last line {@code running} wrote on standard error, all of it read if it has exited. */
+  private String lastErrorLine(Process running) {
+    if (running != null && !running.isAlive()) {
+      try {
+        errorReader.join(1000);
+      } catch (InterruptedException e) {
+        Thread.currentThread().interrupt();
+      }
+    }
     StringBuilder errors = lastError;
     synchronized (errors) {
       String[] lines = errors.toString().strip().split("\n");

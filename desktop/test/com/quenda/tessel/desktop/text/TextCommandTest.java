@@ -66,4 +66,14 @@ class TextCommandTest {
     assertTrue(lines.get(2).length() > 50_000, "the long line is translated whole");
     assertEquals("Prohibido fumar", lines.get(3));
   }
+
+  @Test
+  void charactersApertiumReservesComeBackAsWritten() throws HostException {
+    String line = "Room [B] \\ 2/3 <staff> {7} ^x$";
+    assertEquals(ExitStatus.OK, run((line + "\n").getBytes(StandardCharsets.UTF_8)));
+    String out = lines().get(0);
+    for (String kept : List.of("[B]", "\\", "2/3", "<", ">", "{7}", "^x$")) {
+      assertTrue(out.contains(kept), kept + " in " + out);
+    }
+  }
 }

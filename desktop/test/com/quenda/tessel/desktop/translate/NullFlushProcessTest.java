@@ -56,4 +56,36 @@ class NullFlushProcessTest {
       assertEquals("", upper.ask(""));
     }
   }
+
+  @Test
+  void programThatCannotStartSaysWhyOnce() {
+    // A stand-in that fails at once, as Apertium does with a damaged dictionary.
+    try (NullFlushProcess broken = new NullFlushProcess("stand-in",
+             List.of("sh", "-c", "echo 'cannot open dictionary' >&2; exit 3"), 10_000, logStream)) {
+      HostException e = assertThrows(HostException.class, () -> broken.ask("Exit"));
+      assertEquals(ExitStatus.CHILD_FAILED, e.status);
+      assertTrue(e.getMessage().startsWith("stand-in stopped"), e.getMessage());
+      assertTrue(
+          e.getMessage().endsWith("again after a restart: cannot open dictionary"), e.getMessage());
+    }
+  }
+
+  @Test
+  void closingStopsEveryProgramOfThePipeline() throws Exception {
+    List<ProcessHandle> programs = new java.util.ArrayList<>();
+    try (ApertiumTranslator translator = new ApertiumTranslator(Language.of("en"),
+             Language.of("es"), SignMemory.EMPTY, ApertiumTranslator.TIMEOUT_MILLIS, logStream)) {
+      translator.translate(List.of("Exit"));
+      for (int part = 0; part < 3; part++) {
+        Process process = translator.pipeline().part(part).process();
+        programs.add(process.toHandle());
+        process.descendants().forEach(programs::add);
+      }
+    }
+    assertTrue(programs.size() >= 3, programs.toString());
+    for (ProcessHandle program : programs) {
+      program.onExit().get(10, java.util.concurrent.TimeUnit.SECONDS);
+      assertTrue(!program.isAlive(), program + " still runs");
+    }
+  }
 }
