@@ -83,9 +83,11 @@ final class ApertiumPipeline implements AutoCloseable {
           "cannot read the Apertium mode file " + file + ": reinstall its Debian package");
     }
     try {
-      Process process = new ProcessBuilder("apertium-wblank-mode", "-z", file.toString())
-                            .redirectErrorStream(true)
-                            .start();
+      Process process =
+          NullFlushProcess
+              .withoutPreload(new ProcessBuilder("apertium-wblank-mode", "-z", file.toString()))
+              .redirectErrorStream(true)
+              .start();
       String text = new String(process.getInputStream().readAllBytes(), StandardCharsets.UTF_8);
       if (process.waitFor() != 0 || text.isBlank()) {
         throw new HostException(ExitStatus.MISSING_TRANSLATION,

@@ -121,7 +121,9 @@ final class NullFlushProcess implements AutoCloseable {
   private void start() throws HostException {
     stop();
     try {
-      process = new ProcessBuilder(command).start();
+      ProcessBuilder builder = new ProcessBuilder(command);
+      withoutPreload(builder);
+      process = builder.start();
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "cannot run " + command.get(0) + ": install the Debian package apertium");
@@ -153,6 +155,16 @@ final class NullFlushProcess implements AutoCloseable {
     } catch (IOException e) {
       // Gone already.
     }
+  }
+
+  /**
+   * Drops a library preloaded into the host (a sanitizer's runtime in checked builds) from a
+   * child's environment: the child is not ours to check, and would be slowed or stopped by it.
+   */
+  static ProcessBuilder withoutPreload(ProcessBuilder builder) {
+    builder.environment().keySet().removeAll(
+        List.of("LD_PRELOAD", "ASAN_OPTIONS", "UBSAN_OPTIONS"));
+    return builder;
   }
 
   private static void readAnswers(InputStream stream, BlockingQueue<Object> queue) {
