@@ -64,6 +64,11 @@ final class ApertiumPipeline implements AutoCloseable {
     return parts.get(2).ask(transferred);
   }
 
+  /** The morphological analysis of one segment: its lexical units with every reading. */
+  String analyse(String segment) throws HostException {
+    return parts.get(0).ask(segment);
+  }
+
   /** The running part {@code i} (0 to 2), for tests that stop one. */
   NullFlushProcess part(int i) {
     return parts.get(i);

@@ -55,16 +55,31 @@ enum CaseStyle {
     return words >= 2 && longWords >= 2 && allCapitalised ? TITLE : SENTENCE;
   }
 
-  /** The text as the translator should read it. */
-  String forTranslation(String text) {
+  /**
+   * The text as the translator should read it; words in {@code names} (lower case) keep a
+   * capital.
+   */
+  String forTranslation(String text, Set<String> names) {
     switch (this) {
       case CAPITALS:
-        return SignRules.upperFirst(text.toLowerCase(Locale.ROOT));
+        return sentenceCase(capitalised(text), names);
       case TITLE:
-        return sentenceCase(text);
+        return sentenceCase(text, names);
       default:
         return text;
     }
+  }
+
+  /** Every word with a capital first letter and the rest in lower case. */
+  static String capitalised(String text) {
+    Matcher m = WORD.matcher(text);
+    StringBuilder out = new StringBuilder();
+    while (m.find()) {
+      String word = m.group().toLowerCase(Locale.ROOT);
+      m.appendReplacement(out, Matcher.quoteReplacement(SignRules.upperFirst(word)));
+    }
+    m.appendTail(out);
+    return out.toString();
   }
 
   /** {@code translation} (of a text in this case, starting with {@code source}) in the case. */
@@ -90,7 +105,7 @@ enum CaseStyle {
   }
 
   /** First letter in capitals, the first letters of the other words in lower case. */
-  private static String sentenceCase(String text) {
+  private static String sentenceCase(String text, Set<String> names) {
     Matcher m = WORD.matcher(text);
     StringBuilder out = new StringBuilder();
     boolean first = true;
@@ -99,7 +114,9 @@ enum CaseStyle {
       // Words in capitals inside a title are acronyms ("WC", "ATM"): kept, as are the words
       // English always capitalises.
       boolean acronym = word.length() > 1 && word.equals(word.toUpperCase(Locale.ROOT));
-      boolean keep = first || acronym || ALWAYS_CAPITALISED.contains(word.toLowerCase(Locale.ROOT));
+      String lower = word.toLowerCase(Locale.ROOT);
+      boolean keep =
+          first || acronym || ALWAYS_CAPITALISED.contains(lower) || names.contains(lower);
       m.appendReplacement(out, Matcher.quoteReplacement(keep ? word : SignRules.lowerFirst(word)));
       first = false;
     }

@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.translate;
 import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertSame;
 
+import java.util.Set;
 import org.junit.jupiter.api.Test;
 
 /** The case rule every path shares, and the Spanish article taken into memory phrases. */
@@ -35,9 +36,19 @@ class CaseAndArticleTest {
 
   @Test
   void titlesAreReadInSentenceCaseKeepingAcronymsAndDays() {
-    assertEquals("Lost property office", CaseStyle.TITLE.forTranslation("Lost Property Office"));
-    assertEquals("Free ATM on Sundays", CaseStyle.TITLE.forTranslation("Free ATM On Sundays"));
-    assertEquals("Keep clear", CaseStyle.CAPITALS.forTranslation("KEEP CLEAR"));
+    assertEquals(
+        "Lost property office", CaseStyle.TITLE.forTranslation("Lost Property Office", Set.of()));
+    assertEquals(
+        "Free ATM on Sundays", CaseStyle.TITLE.forTranslation("Free ATM On Sundays", Set.of()));
+    assertEquals("Keep clear", CaseStyle.CAPITALS.forTranslation("KEEP CLEAR", Set.of()));
+  }
+
+  @Test
+  void namesKeepTheirCapitalWhenATitleIsReadInSentenceCase() {
+    assertEquals(
+        "Welcome to Spain", CaseStyle.TITLE.forTranslation("Welcome To Spain", Set.of("spain")));
+    assertEquals(
+        "Welcome to Spain", CaseStyle.CAPITALS.forTranslation("WELCOME TO SPAIN", Set.of("spain")));
   }
 
   private static SignMemory.Match phrase(String text, String english, String spanish) {

@@ -123,6 +123,9 @@ class SignTranslationTest {
     assertTrue(Character.isUpperCase(title.charAt(0)), title);
     assertEquals(title.substring(1), title.substring(1).toLowerCase(), "Spanish: sentence case");
     assertTrue(Character.isLowerCase(es("wait here").charAt(0)));
+    // Names Apertium knows keep their capital in a title read in sentence case.
+    String names = es("Visit Madrid And Barcelona");
+    assertTrue(names.contains("Madrid") && names.contains("Barcelona"), names);
   }
 
   @Test
