@@ -9,8 +9,11 @@ import java.io.PrintStream;
 import java.nio.file.Files;
 import java.nio.file.Path;
 import java.util.ArrayList;
+import java.util.HashSet;
 import java.util.List;
+import java.util.Locale;
 import java.util.Map;
+import java.util.Set;
 import java.util.regex.Matcher;
 import java.util.regex.Pattern;
 
@@ -126,7 +129,8 @@ public final class ApertiumTranslator implements Translator {
       }
     }
     CaseStyle style = CaseStyle.of(flat);
-    String source = style.forTranslation(flat);
+    String source =
+        style.forTranslation(flat, style == CaseStyle.SENTENCE ? Set.of() : names(flat));
     String translation = wholeFromMemory(source);
     if (translation == null) {
       SignRules.Edit edit = rules.edit(source);
@@ -143,6 +147,24 @@ public final class ApertiumTranslator implements Translator {
       translation = edit.finish(plain);
     }
     return style.apply(translation, flat, to.iso);
+  }
+
+  /**
+   * The words of a text in capitals or Title Case that Apertium knows only as names ("Spain",
+   * "Madrid"): they keep their capital when the text is put in sentence case for it.
+   */
+  private Set<String> names(String text) throws HostException {
+    String probe = CaseStyle.capitalised(text);
+    LexicalUnits units = new LexicalUnits(
+        pipeline.analyse(StreamFormat.escape(probe) + "." + StreamFormat.SEGMENT_END));
+    Set<String> names = new HashSet<>();
+    for (int i = 0; i < units.size(); i++) {
+      List<String> readings = LexicalUnits.readings(units.get(i));
+      if (!readings.isEmpty() && readings.stream().allMatch(r -> r.contains("<np>"))) {
+        names.add(LexicalUnits.surface(units.get(i)).toLowerCase(Locale.ROOT));
+      }
+    }
+    return names;
   }
 
   /**
