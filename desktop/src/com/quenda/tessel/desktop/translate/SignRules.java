@@ -246,8 +246,9 @@ final class SignRules {
       String article = String.format("%s<det><def><%s><%s>", ARTICLE.get(target), g, n);
       if (noun == 1) {
         units.insert(1, article);
+        noun = 2;
       }
-      units.set(noun + (noun == 1 ? 1 : 0), lowerFirst(units.get(noun + (noun == 1 ? 1 : 0))));
+      units.set(noun, lowerFirst(units.get(noun)));
     }
 
     private void restrictionFirst(LexicalUnits units) {
