@@ -1,8 +1,6 @@
 package com.quenda.tessel.desktop.typeset;
 
 import com.quenda.tessel.desktop.Upright;
-import com.quenda.tessel.desktop.engine.FontChoice;
-import com.quenda.tessel.desktop.photo.StrokeWeight;
 import java.util.ArrayList;
 import java.util.Arrays;
 import java.util.List;
@@ -17,41 +15,56 @@ import org.opencv.imgproc.Imgproc;
  * are the feet at the bottom of stems: along the baseline the ink runs in wide strokes (feet,
  * and the bowls' bottoms), halfway up the small letters in narrow ones (stems, the bowls'
  * sides). In a sans face the stems end as they run, so the two widths stay close; the feet of a
- * serif face make the baseline's runs twice as wide and more. Bold comes from the stroke width.
+ * serif face make the baseline's runs wider by a sixth of the small letters' height and more.
+ * Bold faces have wider stems. Lines are measured scaled to one height.
  */
 public final class FaceDetector {
-  // Baseline runs over middle runs above this read as serif: sans text measures 1.0 to 1.6,
-  // serif text 2.2 and up (on rendered and photographed lines of 12 to 60 pixels).
-  static final double SERIF_RATIO = 1.9;
-  // Below this height the feet are a pixel or less: too small to tell.
+  // A serif reach above this reads as serif: sans faces measure 0 to 0.04, serif faces 0.15 and
+  // up, bold or regular (Noto and DejaVu, lines 16 to 60 pixels tall).
+  static final double SERIF_REACH = 0.09;
+  // Stems wider than this share of the small letters' height read as bold: regular faces measure
+  // 0.17 to 0.23, bold ones 0.28 and up.
+  static final double BOLD_STEM = 0.255;
+  // Below this line height the feet are a pixel or less: too small to tell.
+  static final double MIN_LINE_HEIGHT = 10;
   static final int MIN_CORE_ROWS = 6;
+  // Lines are measured at this height (pixels).
+  static final double NORMAL_HEIGHT = 64;
 
   private FaceDetector() {}
 
   /** The face of the lines at {@code rects} in {@code rgb} (8-bit, 3 channels). */
   public static Face detect(Mat rgb, List<RotatedRect> rects) {
-    List<Double> ratios = new ArrayList<>();
+    List<Double> reaches = new ArrayList<>();
+    List<Double> stems = new ArrayList<>();
     for (RotatedRect rect : rects) {
-      double ratio = serifRatio(rgb, rect);
-      if (!Double.isNaN(ratio)) {
-        ratios.add(ratio);
+      Strokes strokes = measure(rgb, rect);
+      if (strokes != null) {
+        reaches.add(strokes.serifReach());
+        stems.add(strokes.stem());
       }
     }
-    boolean serif = !ratios.isEmpty() && median(ratios) > SERIF_RATIO;
-    boolean bold =
-        FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects)) == FontChoice.Weight.BOLD;
-    return Face.of(serif, bold);
+    if (reaches.isEmpty()) {
+      return Face.SANS;
+    }
+    return Face.of(median(reaches) > SERIF_REACH, median(stems) > BOLD_STEM);
   }
 
   /**
-   * The median ink run along the baseline over the median run halfway up the small letters, in
-   * the line at {@code rect}; NaN when the line is too small or holds no ink.
+   * A line's strokes, as shares of its small letters' height: how much wider the ink runs along
+   * the baseline than halfway up (the serifs' reach), and how wide it runs halfway up (the
+   * stems).
    */
-  static double serifRatio(Mat rgb, RotatedRect rect) {
-    if (rect.size.height < MIN_CORE_ROWS || rect.size.width < MIN_CORE_ROWS) {
-      return Double.NaN;
+  record Strokes(double serifReach, double stem) {}
+
+  /** The strokes of the line at {@code rect}; null when it is too small or holds no ink. */
+  static Strokes measure(Mat rgb, RotatedRect rect) {
+    if (rect.size.height < MIN_LINE_HEIGHT || rect.size.width < MIN_LINE_HEIGHT) {
+      return null;
     }
-    Mat ink = inkOf(rgb, rect);
+    // Scaled to one height, so a pixel's rounding weighs the same in small and large lines.
+    double scale = NORMAL_HEIGHT / rect.size.height;
+    Mat ink = inkOf(rgb, rect, scale);
     int rows = ink.rows();
     int cols = ink.cols();
     byte[] pixels = new byte[rows * cols];
@@ -76,19 +89,20 @@ public final class FaceDetector {
     }
     int core = bottom - top + 1;
     if (top < 0 || core < MIN_CORE_ROWS) {
-      return Double.NaN;
+      return null;
     }
     int footRows = Math.max(1, (int) Math.round(0.1 * core));
     double foot = medianRun(pixels, cols, bottom - footRows + 1, bottom);
     double middle =
         medianRun(pixels, cols, top + (int) (0.4 * core), top + (int) Math.ceil(0.6 * core));
-    return middle > 0 ? foot / middle : Double.NaN;
+    return middle > 0 ? new Strokes((foot - middle) / core, middle / core) : null;
   }
 
   /** The line's ink, upright, 255 where ink: the smaller side of Otsu's threshold. */
-  private static Mat inkOf(Mat rgb, RotatedRect rect) {
-    Mat upright = Upright.cut(rgb, rect.center, rect.angle, 1,
-        new Size(Math.round(rect.size.width), Math.round(rect.size.height)), Imgproc.INTER_LINEAR);
+  private static Mat inkOf(Mat rgb, RotatedRect rect, double scale) {
+    Mat upright = Upright.cut(rgb, rect.center, rect.angle, scale,
+        new Size(Math.round(scale * rect.size.width), Math.round(scale * rect.size.height)),
+        Imgproc.INTER_CUBIC);
     Mat grey = new Mat();
     Imgproc.cvtColor(upright, grey, Imgproc.COLOR_RGB2GRAY);
     upright.release();

@@ -55,7 +55,8 @@ public final class LineBreaker {
           continue;
         }
         double miss = Math.abs(target - measure(0, b));
-        if (miss < bestMiss) {
+        // On a tie the line takes the text: a one-word translation goes on the first line.
+        if (miss < bestMiss || (best == start && miss <= bestMiss)) {
           best = b;
           bestMiss = miss;
         }
