@@ -12,16 +12,17 @@ import org.opencv.imgproc.Imgproc;
 
 /**
  * Whether a block was printed in a serif or a sans face, and bold or not, from its ink. Serifs
- * are the feet at the bottom of stems: along the baseline the ink runs in wide strokes (feet,
- * and the bowls' bottoms), halfway up the small letters in narrow ones (stems, the bowls'
- * sides). In a sans face the stems end as they run, so the two widths stay close; the feet of a
- * serif face make the baseline's runs wider by a sixth of the small letters' height and more.
- * Bold faces have wider stems. Lines are measured scaled to one height.
+ * are the feet at the bottom of stems: a stem crossing the middle of the small letters stands, at
+ * the baseline, on ink that reaches out on both sides of it in a serif face, and on ink as wide
+ * as itself in a sans face (whose "t", "u" and "a" may have a tail, but on one side only). Bold
+ * faces have wider stems. Lines are measured scaled to one height, so a pixel's rounding weighs
+ * the same in small and large lines.
  */
 public final class FaceDetector {
-  // A serif reach above this reads as serif: sans faces measure 0 to 0.04, serif faces 0.15 and
-  // up, bold or regular (Noto and DejaVu, lines 16 to 60 pixels tall).
-  static final double SERIF_REACH = 0.09;
+  // A serif reach above this share of the small letters' height reads as serif: sans faces
+  // measure 0, serif faces 0.11 to 0.16, bold or regular (Noto and DejaVu, lines of 16 to 60
+  // pixels, printed or photographed).
+  static final double SERIF_REACH = 0.05;
   // Stems wider than this share of the small letters' height read as bold: regular faces measure
   // 0.17 to 0.23, bold ones 0.28 and up.
   static final double BOLD_STEM = 0.255;
@@ -51,9 +52,8 @@ public final class FaceDetector {
   }
 
   /**
-   * A line's strokes, as shares of its small letters' height: how much wider the ink runs along
-   * the baseline than halfway up (the serifs' reach), and how wide it runs halfway up (the
-   * stems).
+   * A line's strokes, as shares of its small letters' height: how far its stems' feet reach out
+   * on both sides (the upper quartile over its stems), and how wide its stems are (the median).
    */
   record Strokes(double serifReach, double stem) {}
 
@@ -62,7 +62,6 @@ public final class FaceDetector {
     if (rect.size.height < MIN_LINE_HEIGHT || rect.size.width < MIN_LINE_HEIGHT) {
       return null;
     }
-    // Scaled to one height, so a pixel's rounding weighs the same in small and large lines.
     double scale = NORMAL_HEIGHT / rect.size.height;
     Mat ink = inkOf(rgb, rect, scale);
     int rows = ink.rows();
@@ -92,10 +91,55 @@ public final class FaceDetector {
       return null;
     }
     int footRows = Math.max(1, (int) Math.round(0.1 * core));
-    double foot = medianRun(pixels, cols, bottom - footRows + 1, bottom);
-    double middle =
-        medianRun(pixels, cols, top + (int) (0.4 * core), top + (int) Math.ceil(0.6 * core));
-    return middle > 0 ? new Strokes((foot - middle) / core, middle / core) : null;
+    List<Double> reaches = new ArrayList<>();
+    List<Double> stems = new ArrayList<>();
+    for (double at : new double[] {0.4, 0.5, 0.6}) {
+      int stemRow = top + (int) Math.round(at * core);
+      for (int footRow = bottom - footRows + 1; footRow <= bottom; footRow++) {
+        footReaches(pixels, cols, stemRow, footRow, core, reaches, stems);
+      }
+    }
+    if (reaches.isEmpty()) {
+      return null;
+    }
+    // Not every stem has feet on both sides ("d", "a" and "u" have one): the upper quartile.
+    return new Strokes(quantile(reaches, 0.75) / core, quantile(stems, 0.5) / core);
+  }
+
+  /**
+   * For each stem crossing {@code stemRow} (a run narrower than half the small letters' height)
+   * that stands on ink in {@code footRow}, how much wider that ink runs than the stem; adds the
+   * stems' widths to {@code stems}. Bowls are left out: their sides do not reach the baseline
+   * where they cross the middle.
+   */
+  private static void footReaches(byte[] pixels, int cols, int stemRow, int footRow, int core,
+      List<Double> reaches, List<Double> stems) {
+    int start = -1;
+    for (int x = 0; x <= cols; x++) {
+      boolean ink = x < cols && pixels[stemRow * cols + x] != 0;
+      if (ink && start < 0) {
+        start = x;
+      } else if (!ink && start >= 0) {
+        int width = x - start;
+        int stemLeft = start;
+        int centre = (start + x) / 2;
+        start = -1;
+        if (width * 2 > core || pixels[footRow * cols + centre] == 0) {
+          continue;
+        }
+        int left = centre;
+        int right = centre;
+        while (left > 0 && pixels[footRow * cols + left - 1] != 0) {
+          left--;
+        }
+        while (right < cols - 1 && pixels[footRow * cols + right + 1] != 0) {
+          right++;
+        }
+        // Feet reach out on both sides; the tails of a sans "t", "u" or "a" on one.
+        reaches.add((double) Math.min(stemLeft - left, right - (stemLeft + width - 1)));
+        stems.add((double) width);
+      }
+    }
   }
 
   /** The line's ink, upright, 255 where ink: the smaller side of Otsu's threshold. */
@@ -115,26 +159,13 @@ public final class FaceDetector {
     return ink;
   }
 
-  /** The median length of the horizontal ink runs in rows {@code from..to}; 0 without ink. */
-  private static double medianRun(byte[] pixels, int cols, int from, int to) {
-    List<Double> runs = new ArrayList<>();
-    for (int y = from; y <= to; y++) {
-      int run = 0;
-      for (int x = 0; x <= cols; x++) {
-        if (x < cols && pixels[y * cols + x] != 0) {
-          run++;
-        } else if (run > 0) {
-          runs.add((double) run);
-          run = 0;
-        }
-      }
-    }
-    return runs.isEmpty() ? 0 : median(runs);
+  private static double median(List<Double> values) {
+    return quantile(values, 0.5);
   }
 
-  private static double median(List<Double> values) {
+  private static double quantile(List<Double> values, double q) {
     double[] sorted = values.stream().mapToDouble(Double::doubleValue).toArray();
     Arrays.sort(sorted);
-    return sorted[sorted.length / 2];
+    return sorted[(int) (q * (sorted.length - 1) + 0.5)];
   }
 }

@@ -3,6 +3,9 @@ package com.quenda.tessel.desktop.typeset;
 import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
+import com.quenda.tessel.desktop.scenes.Scene;
+import com.quenda.tessel.desktop.scenes.SceneLine;
+import com.quenda.tessel.desktop.scenes.Scenes;
 import java.util.List;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
@@ -40,10 +43,10 @@ class FaceDetectorTest {
       FaceDetector.Strokes sans = measure(PrintedPage.NOTO + "NotoSans-Regular.ttf", size);
       FaceDetector.Strokes sansBold = measure(PrintedPage.NOTO + "NotoSans-Bold.ttf", size);
       for (FaceDetector.Strokes s : List.of(serif, serifBold)) {
-        assertTrue(s.serifReach() > 1.5 * FaceDetector.SERIF_REACH, size + ": " + s);
+        assertTrue(s.serifReach() > 2 * FaceDetector.SERIF_REACH, size + ": " + s);
       }
       for (FaceDetector.Strokes s : List.of(sans, sansBold)) {
-        assertTrue(s.serifReach() < FaceDetector.SERIF_REACH / 1.5, size + ": " + s);
+        assertTrue(s.serifReach() < FaceDetector.SERIF_REACH / 2, size + ": " + s);
       }
       for (FaceDetector.Strokes s : List.of(serifBold, sansBold)) {
         assertTrue(s.stem() > 1.08 * FaceDetector.BOLD_STEM, size + ": " + s);
@@ -51,6 +54,19 @@ class FaceDetectorTest {
       for (FaceDetector.Strokes s : List.of(serif, sans)) {
         assertTrue(s.stem() < FaceDetector.BOLD_STEM / 1.08, size + ": " + s);
       }
+    }
+  }
+
+  @Test
+  void photographedSignsAndPagesAreToldApart() {
+    // Signs in a bold sans with tails on "t", "u" and "a", tilted and blurred; a serif page.
+    for (String name : List.of("street", "station", "shop", "page")) {
+      Scene scene = Scenes.bundled(name);
+      Face expected = name.equals("page") ? Face.SERIF : Face.SANS_BOLD;
+      for (SceneLine line : scene.lines) {
+        assertEquals(expected, FaceDetector.detect(scene.rgb, List.of(line.rect)), line.text);
+      }
+      scene.release();
     }
   }
 
