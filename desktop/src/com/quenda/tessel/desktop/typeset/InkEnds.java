@@ -22,8 +22,9 @@ public final class InkEnds {
   // it for ascenders, descenders and accents.
   static final double ALONG_MARGIN = 0.6;
   static final double ACROSS_MARGIN = 0.35;
-  // Room left around the ink in the rectangle for erasing, in line heights.
-  static final double ERASE_ALONG_PAD = 0.25;
+  // Room left above and below the ink in the rectangle for erasing, in line heights. None is
+  // added at the ends: a sign's lettering often runs close to its edge, and the engine's own
+  // widening already reaches it.
   static final double ERASE_ACROSS_PAD = 0.2;
 
   private InkEnds() {}
@@ -53,11 +54,10 @@ public final class InkEnds {
     double top = box[2] - cy;
     double bottom = box[3] - cy;
     // The engine fills a patch from its border: ink within a pixel or two of the border is
-    // smeared into it as a grey smudge, so the rectangle leaves room around the ink.
-    double alongPad = ERASE_ALONG_PAD * h;
-    double acrossPad = ERASE_ACROSS_PAD * h;
+    // smeared into it as a grey smudge, so the rectangle leaves room above and below the ink.
+    double pad = ERASE_ACROSS_PAD * h;
     RotatedRect erase = moved(rect, (left + right) / 2, (top + bottom) / 2,
-        new Size(right - left + 2 * alongPad, bottom - top + 2 * acrossPad));
+        new Size(right - left, bottom - top + 2 * pad));
     RotatedRect along = moved(rect, (left + right) / 2, 0, new Size(right - left, h));
     return new Cover(erase, along);
   }
