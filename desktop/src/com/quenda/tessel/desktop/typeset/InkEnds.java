@@ -56,8 +56,9 @@ public final class InkEnds {
     // The engine fills a patch from its border: ink within a pixel or two of the border is
     // smeared into it as a grey smudge, so the rectangle leaves room above and below the ink.
     double pad = ERASE_ACROSS_PAD * h;
+    // Half a pixel more at each end: the cut's pixel grid may sit half a pixel off the box's.
     RotatedRect erase = moved(rect, (left + right) / 2, (top + bottom) / 2,
-        new Size(right - left, bottom - top + 2 * pad));
+        new Size(right - left + 1, bottom - top + 2 * pad));
     RotatedRect along = moved(rect, (left + right) / 2, 0, new Size(right - left, h));
     return new Cover(erase, along);
   }

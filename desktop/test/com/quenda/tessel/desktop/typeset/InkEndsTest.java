@@ -62,12 +62,12 @@ class InkEndsTest {
     assertEquals(boxTop - padding, top, 0.5);
   }
 
-  /** Dark pixels of the line's surroundings outside {@code rect} (upright). */
+  /** Pixels darker than mid-grey (ink, not its antialiased fringe) outside {@code rect}. */
   private static int darkOutside(Mat rgb, RotatedRect rect) {
     int count = 0;
     for (int y = 0; y < rgb.rows(); y++) {
       for (int x = 0; x < rgb.cols(); x++) {
-        boolean dark = rgb.get(y, x)[1] < 200;
+        boolean dark = rgb.get(y, x)[1] < 128;
         boolean inside = Math.abs(x + 0.5 - rect.center.x) <= rect.size.width / 2
             && Math.abs(y + 0.5 - rect.center.y) <= rect.size.height / 2;
         count += dark && !inside ? 1 : 0;
