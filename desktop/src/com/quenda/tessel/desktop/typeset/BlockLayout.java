@@ -94,6 +94,8 @@ public final class BlockLayout {
     final List<RotatedRect> full = new ArrayList<>();
     /** Pixels per em at the original's size: the lines' median. */
     final double fullScale;
+    /** Where each line's baseline lies below its full-size rectangle's centre, in pixels. */
+    final double[] baselines;
     /** Each line's own length, and how long its text may be, in pixels. */
     final double[] widths;
     final double[] room;
@@ -107,14 +109,20 @@ public final class BlockLayout {
       this.originalMetrics = originalMetrics;
       int n = spans.size();
       double[] scales = new double[n];
+      baselines = new double[n];
       for (int i = 0; i < n; i++) {
         String kind = translations.get(i) == null ? originals.get(i) : translations.get(i);
         RotatedRect rect = TextPlacement.textRect(spans.get(i), originals.get(i), kind);
         full.add(rect);
-        scales[i] = HEIGHT_FILL * rect.size.height / metrics.kindHeight(kind);
+        TextMetrics.Box box = metrics.kindBox(kind);
+        scales[i] = HEIGHT_FILL * rect.size.height / box.height();
+        // The renderer centres the box on the rectangle: the baseline lies below the centre by
+        // the box's middle's height above the baseline.
+        baselines[i] = scales[i] * (box.top() + box.bottom()) / 2;
       }
-      Arrays.sort(scales);
-      fullScale = scales[n / 2];
+      double[] sorted = scales.clone();
+      Arrays.sort(sorted);
+      fullScale = sorted[n / 2];
       widths = new double[n];
       room = room(spans, align, axis, widths);
     }
@@ -137,8 +145,8 @@ public final class BlockLayout {
           placed.add(new Placed(null, full.get(i), 0));
           continue;
         }
-        RotatedRect rect =
-            textRect(full.get(i), spans.get(i), piece, align, i == n - 1, scale, metrics);
+        RotatedRect rect = textRect(
+            full.get(i), baselines[i], spans.get(i), piece, align, i == n - 1, scale, metrics);
         double drawnCap = scale * metrics.capHeight();
         double originalCap = spans.get(i).size.height * originalMetrics.capHeight()
             / originalMetrics.inkBoxHeight(originals.get(i));
@@ -202,16 +210,17 @@ public final class BlockLayout {
 
   /**
    * The rectangle that has the renderer draw {@code piece} at {@code scale} pixels per em: its
-   * baseline where the full-size rectangle {@code full} has it, its start, centre or end where
-   * the original line's ({@code span}) was.
+   * baseline {@code baseline} below the full-size rectangle {@code full}'s centre, its start,
+   * centre or end where the original line's ({@code span}) was.
    */
-  private static RotatedRect textRect(RotatedRect full, RotatedRect span, String piece,
-      Align align, boolean last, double scale, TextMetrics metrics) {
+  private static RotatedRect textRect(RotatedRect full, double baseline, RotatedRect span,
+      String piece, Align align, boolean last, double scale, TextMetrics metrics) {
     if (piece.isEmpty()) {
       return full;
     }
     double width = scale * metrics.width(piece);
-    double height = scale * metrics.fittedHeight(piece) / HEIGHT_FILL;
+    TextMetrics.Box box = metrics.fittedBox(piece);
+    double height = scale * box.height() / HEIGHT_FILL;
     double half = span.size.width / 2;
     double along = switch (align) {
       case LEFT -> -half + width / 2;
@@ -220,7 +229,8 @@ public final class BlockLayout {
       case JUSTIFIED -> last ? -half + width / 2 :
           0;
       };
-      double across = (full.size.height - height) / 2;
+      // Down the rectangle from the full-size one's centre to the piece's box's middle.
+      double across = baseline - scale * (box.top() + box.bottom()) / 2;
       double radians = Math.toRadians(full.angle);
       double c = Math.cos(radians);
       double s = Math.sin(radians);

@@ -75,8 +75,13 @@ public final class TextMetrics {
 
   /** The height the renderer fits to the rectangle's height. */
   public double fittedHeight(String text) {
+    return fittedBox(text).height();
+  }
+
+  /** What the renderer fits to the rectangle's height, from the baseline. */
+  Box fittedBox(String text) {
     Box kind = kindBox(text);
-    return text.isBlank() ? kind.height() : kind.union(ink(text, kind)).height();
+    return text.isBlank() ? kind : kind.union(ink(text, kind));
   }
 
   /** The height of the ink box for {@code text}'s kind, without its own ink. */
@@ -102,7 +107,8 @@ public final class TextMetrics {
     return top - (low ? lowercase.bottom : 0);
   }
 
-  private Box kindBox(String text) {
+  /** The ink box for {@code text}'s kind, from the baseline. */
+  Box kindBox(String text) {
     if (cjk) {
       return ideographs;
     }

@@ -84,6 +84,24 @@ class BlockLayoutTest {
   }
 
   @Test
+  void everyLineStandsOnTheOriginalsBaselineWhateverItsLetters() {
+    // A sign in capitals whose translation has a small word: the lines in capitals only must not
+    // drop to where the small letters' descenders would end.
+    List<String> originals = List.of("SUMMER SCHOOL", "IN DATA ANALYSIS");
+    List<RotatedRect> spans = List.of(span(100, 600, 100), span(100, 640, 150));
+    BlockLayout.Layout layout = BlockLayout.lay(originals, spans,
+        "ESCUELA DE VERANO EN ANÁLISIS de DATOS", Align.LEFT, 0, SANS, SANS, Locale.ROOT);
+    for (int i = 0; i < 2; i++) {
+      BlockLayout.Placed line = layout.lines().get(i);
+      TextMetrics.Box box = SANS.fittedBox(line.text());
+      double scale = BlockLayout.HEIGHT_FILL * line.textRect().size.height / box.height();
+      double baseline = line.textRect().center.y + scale * (box.top() + box.bottom()) / 2;
+      double originalBaseline = spans.get(i).center.y + spans.get(i).size.height / 2;
+      assertEquals(originalBaseline, baseline, 1.0, line.text());
+    }
+  }
+
+  @Test
   void linesTranslatedOneByOneShareOneSize() {
     List<String> perLine =
         java.util.Arrays.asList("Öffnungszeiten: Montag bis Freitag", "Notausgang", null);
