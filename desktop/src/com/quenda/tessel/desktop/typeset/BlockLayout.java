@@ -127,6 +127,21 @@ public final class BlockLayout {
       room = room(spans, align, axis, widths);
     }
 
+    /**
+     * The original's capital height: the block's lines were printed at one size, so the median
+     * over its lines, each estimated from its box and its text's letters in the original's face
+     * (a reader's box varies by a few pixels from line to line).
+     */
+    double originalCapHeight() {
+      double[] caps = new double[spans.size()];
+      for (int i = 0; i < caps.length; i++) {
+        caps[i] = spans.get(i).size.height * originalMetrics.capHeight()
+            / originalMetrics.inkBoxHeight(originals.get(i));
+      }
+      Arrays.sort(caps);
+      return caps[caps.length / 2];
+    }
+
     boolean fitsAt(List<String> pieces, double scale) {
       for (int i = 0; i < pieces.size(); i++) {
         if (metrics.width(pieces.get(i)) * scale > room[i]) {
@@ -138,6 +153,7 @@ public final class BlockLayout {
 
     Layout place(List<String> pieces, double scale, boolean fits) {
       int n = spans.size();
+      double originalCap = originalCapHeight();
       List<Placed> placed = new ArrayList<>();
       for (int i = 0; i < n; i++) {
         String piece = pieces.get(i);
@@ -147,10 +163,7 @@ public final class BlockLayout {
         }
         RotatedRect rect = textRect(
             full.get(i), baselines[i], spans.get(i), piece, align, i == n - 1, scale, metrics);
-        double drawnCap = scale * metrics.capHeight();
-        double originalCap = spans.get(i).size.height * originalMetrics.capHeight()
-            / originalMetrics.inkBoxHeight(originals.get(i));
-        placed.add(new Placed(piece, rect, drawnCap / originalCap));
+        placed.add(new Placed(piece, rect, scale * metrics.capHeight() / originalCap));
       }
       return new Layout(placed, fits);
     }
