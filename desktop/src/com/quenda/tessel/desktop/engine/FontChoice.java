@@ -1,11 +1,13 @@
 package com.quenda.tessel.desktop.engine;
 
 import com.quenda.tessel.desktop.Language;
+import com.quenda.tessel.desktop.typeset.Face;
 
 /**
  * The font a translation is drawn in. The engine's default font is a CJK font whose Latin glyphs
- * are set in a tall line box; Latin, Greek and Cyrillic translations get Noto Sans instead, in the
- * weight closest to the original text's, so that the translation looks printed where it stands.
+ * are set in a tall line box; Latin, Greek and Cyrillic translations get a Noto face instead, serif
+ * or sans and in the weight closest to the original text's, so that the translation looks printed
+ * where it stands.
  */
 public final class FontChoice {
   /** How heavy the original text's strokes are. */
@@ -22,11 +24,12 @@ public final class FontChoice {
    * it), or null to keep the engine's default font for the language (CJK scripts).
    */
   public static String platformFont(Language language, Weight weight) {
-    if (language.isCjk()) {
-      return null;
-    }
-    return weight == Weight.BOLD ? "/system/fonts/NotoSans-Bold.ttf"
-                                 : "/system/fonts/NotoSans-Regular.ttf";
+    return platformFont(language, weight == Weight.BOLD ? Face.SANS_BOLD : Face.SANS);
+  }
+
+  /** The platform font for {@code language} in {@code face}; null for CJK scripts. */
+  public static String platformFont(Language language, Face face) {
+    return language.isCjk() ? null : "/system/fonts/" + face.file;
   }
 
   /** The weight of text whose median stroke width is {@code strokeRatio} of its line height. */

@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.engine;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
+import com.quenda.tessel.desktop.typeset.Face;
 import java.lang.ref.Reference;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
@@ -39,7 +40,18 @@ public final class OverlayDrawer implements AutoCloseable {
 
   /** Texts from now on are in {@code language}, in the font the host picks for its script. */
   public void setLanguage(Language language, FontChoice.Weight weight) {
-    String font = FontChoice.platformFont(language, weight);
+    bindFont(language, FontChoice.platformFont(language, weight));
+  }
+
+  /**
+   * Texts from now on are in {@code language}, in {@code face} (CJK scripts keep the engine's
+   * font). Text objects already built keep their font until they are retired.
+   */
+  public void setLanguage(Language language, Face face) {
+    bindFont(language, FontChoice.platformFont(language, face));
+  }
+
+  private static void bindFont(Language language, String font) {
     if (font != null) {
       VexelJNI.setTranslationLanguageFont(language.engine, font);
     }

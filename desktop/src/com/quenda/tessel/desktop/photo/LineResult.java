@@ -1,21 +1,45 @@
 package com.quenda.tessel.desktop.photo;
 
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
+import com.quenda.tessel.desktop.typeset.Align;
+import com.quenda.tessel.desktop.typeset.Face;
 import java.util.LinkedHashMap;
 import java.util.Map;
 
 /** One recognised line and what became of it. */
 public final class LineResult {
   public final RecognizedLine line;
-  /** Null when the line could not be translated: it is then left as it was in the image. */
+  /**
+   * The piece of its block's translation drawn on this line; null when the block could not be
+   * translated: the line is then left as it was in the image.
+   */
   public final String translation;
   /** The engine's text colour, 0xFF000000 | B << 16 | G << 8 | R; 0 when not erased. */
   public final int color;
 
+  /** The index of the line's block in the report's blocks. */
+  public final int block;
+  /** The drawn capitals' height over the original's; 0 when not drawn. */
+  public final double sizeRatio;
+  /** Null for a line translated on its own. */
+  public final Align align;
+  /** Null where not translated, and for CJK translations (drawn in the engine's own font). */
+  public final Face face;
+
+  /** A line translated on its own (video keyframes): no block, size, alignment or face. */
   public LineResult(RecognizedLine line, String translation, int color) {
+    this(line, translation, color, -1, 0, null, null);
+  }
+
+  public LineResult(RecognizedLine line, String translation, int color, int block, double sizeRatio,
+      Align align, Face face) {
     this.line = line;
     this.translation = translation;
     this.color = color;
+    this.block = block;
+    this.sizeRatio = sizeRatio;
+    this.align = align;
+    this.face = face;
   }
 
   public boolean translated() {
@@ -32,6 +56,12 @@ public final class LineResult {
             line.rect.size.height, line.rect.angle});
     json.put("color", translated() ? hex(color) : null);
     json.put("confidence", Math.round(line.confidence));
+    if (align != null) {
+      json.put("block", block);
+      json.put("size_ratio", translated() ? Math.round(sizeRatio * 1000) / 1000.0 : null);
+      json.put("align", align.label);
+      json.put("face", translated() && face != null ? face.label : null);
+    }
     return json;
   }
 

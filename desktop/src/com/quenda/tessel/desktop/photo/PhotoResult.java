@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.photo;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Json;
 import com.quenda.tessel.desktop.OutputFiles;
+import com.quenda.tessel.desktop.typeset.Typesetter;
 import java.util.ArrayList;
 import java.util.Arrays;
 import java.util.LinkedHashMap;
@@ -22,15 +23,17 @@ public final class PhotoResult {
   public final Mat original;
   public final Mat translated;
   public final List<LineResult> lines;
+  public final List<Typesetter.SetBlock> blocks;
   public final StageTimes times;
   public final double totalMillis;
 
-  PhotoResult(
-      PhotoInput input, Mat original, Mat translated, List<LineResult> lines, StageTimes times) {
+  PhotoResult(PhotoInput input, Mat original, Mat translated, List<LineResult> lines,
+      List<Typesetter.SetBlock> blocks, StageTimes times) {
     this.input = input;
     this.original = original;
     this.translated = translated;
     this.lines = lines;
+    this.blocks = blocks;
     this.times = times;
     this.totalMillis = times.sinceStart();
   }
@@ -72,6 +75,18 @@ public final class PhotoResult {
     }
     Map<String, Object> json = new LinkedHashMap<>();
     json.put("lines", lineList);
+    List<Object> blockList = new ArrayList<>();
+    for (Typesetter.SetBlock block : blocks) {
+      Map<String, Object> b = new LinkedHashMap<>();
+      b.put("lines", block.block().lines);
+      b.put("source", block.source());
+      b.put("translation", block.translation());
+      b.put("align", block.block().align.label);
+      b.put("face", block.face() == null ? null : block.face().label);
+      b.put("fits", block.translation() == null ? null : block.fits());
+      blockList.add(b);
+    }
+    json.put("blocks", blockList);
     json.put("timings_ms", times.json(totalMillis));
     return json;
   }
