@@ -18,7 +18,8 @@ import org.opencv.core.RotatedRect;
  * tracked place it is scaled, turned and colour-corrected by the renderer. Past a quarter more or
  * less in size, 10 degrees of turn or a light change of a third in any channel, the stretched
  * patch no longer passes for the surface under it, and the line is erased again from the current
- * frame, keeping its text, translation and id.
+ * frame, keeping its text, translation and line id (the new patch gets an id of its own, so that
+ * the renderer takes its pixels).
  */
 public final class KeyframeRules {
   static final double MIN_COVERAGE = 0.6;

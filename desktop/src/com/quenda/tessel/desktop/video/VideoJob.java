@@ -109,6 +109,7 @@ public final class VideoJob {
     private Mat keyframeRgba;
     private List<ShownLine> shown = new ArrayList<>();
     private long nextId;
+    private long nextPatchId;
     private int lastKeyframe = Integer.MIN_VALUE;
     private boolean fontChosen;
     private List<Object> gainsKey;
@@ -358,8 +359,9 @@ public final class VideoJob {
           continue;
         }
         ShownLine shownLine = new ShownLine(idFor(line), result.frame(), line, translation);
-        shownLine.replacePatch(result.patches().overlays.get(p), result.patches().colors[p],
-            line.rect, Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
+        shownLine.replacePatch(result.patches().overlays.get(p), nextPatchId++,
+            result.patches().colors[p], line.rect,
+            Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
         next.add(shownLine);
         ++p;
       }
@@ -469,8 +471,8 @@ public final class VideoJob {
       Eraser.Patches patches = Eraser.erase(frame, rects);
       double[] means = FrameMeans.under(frame, patches.patchRects);
       for (int i = 0; i < stale.size(); i++) {
-        stale.get(i).replacePatch(patches.overlays.get(i), patches.colors[i], rects.get(i),
-            Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
+        stale.get(i).replacePatch(patches.overlays.get(i), nextPatchId++, patches.colors[i],
+            rects.get(i), Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
       }
       timings.add("erase again", (System.nanoTime() - start) / 1e6);
     }
@@ -497,7 +499,7 @@ public final class VideoJob {
       for (int i = 0; i < n; i++) {
         ShownLine line = visible.get(i);
         texts[i] = line.translation;
-        ids[i] = line.id;
+        ids[i] = line.patchId;
         patches[i] = line.patch.getNativeObjAddr();
         colors[i] = line.color;
         textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));

@@ -98,6 +98,18 @@ class VideoLoopTest {
 
   static VideoResult translate(CameraSequence sequence, boolean live, long extraOcrMillis, Path out)
       throws Exception {
+    // Live, frames come at 15 per second: the loop keeps up with that on two cores while the
+    // worker runs OCR beside it and other tests run.
+    return translate(source(sequence, live ? 15 : 30), live, extraOcrMillis, out);
+  }
+
+  /** Translates {@code source} from English to Spanish offline into {@code out}. */
+  static VideoResult translate(FrameSource source, Path out) throws Exception {
+    return translate(source, false, 0, out);
+  }
+
+  static VideoResult translate(FrameSource source, boolean live, long extraOcrMillis, Path out)
+      throws Exception {
     String[] args = live
         ? new String[] {"video", "walk", "--out", out.toString(), "--live", "--quiet"}
         : new String[] {"video", "walk", "--out", out.toString(), "--quiet"};
@@ -106,9 +118,7 @@ class VideoLoopTest {
         Translators.create(Language.of("en"), Language.of("es"), null), Language.of("es"), live,
         extraOcrMillis);
     PrintStream quiet = new PrintStream(new ByteArrayOutputStream(), true, StandardCharsets.UTF_8);
-    // Live, frames come at 15 per second: the loop keeps up with that on two cores while the
-    // worker runs OCR beside it and other tests run.
-    return VideoCommand.run(job, source(sequence, live ? 15 : 30), command, quiet, quiet);
+    return VideoCommand.run(job, source, command, quiet, quiet);
   }
 
   /** The largest distance between a drawn line's centre and where its text truly is. */
