@@ -37,7 +37,7 @@ public final class KeyframeRules {
     if (scale > MAX_SCALE_CHANGE || scale < 1 / MAX_SCALE_CHANGE) {
       return true;
     }
-    if (Math.abs(now.angle - erasedAt.angle) > MAX_TURN_DEGREES) {
+    if (turnDegrees(erasedAt.angle, now.angle) > MAX_TURN_DEGREES) {
       return true;
     }
     for (double gain : gains) {
@@ -46,5 +46,14 @@ public final class KeyframeRules {
       }
     }
     return false;
+  }
+
+  /**
+   * How far a line turned from {@code fromDegrees} to {@code toDegrees}, 0..180: the short way
+   * round, so that 179 and -179 are 2 degrees apart, not 358.
+   */
+  static double turnDegrees(double fromDegrees, double toDegrees) {
+    double turn = Math.abs(toDegrees - fromDegrees) % 360;
+    return turn > 180 ? 360 - turn : turn;
   }
 }
