@@ -52,9 +52,11 @@ import org.opencv.imgproc.Imgproc;
  * through untouched.
  */
 public final class VideoJob {
-  // Frames queued for catching up while a live keyframe is worked on: 8 s at 30 fps. A result later
-  // than that is dropped and a new keyframe taken.
-  private static final int MAX_CATCH_UP_FRAMES = 240;
+  // The frames queued for catching up while a live keyframe is worked on are bounded by their
+  // size: 512 MiB is about 190 frames at 720p, 80 at 1080p, 20 at 4K. When the queue is full the
+  // keyframe is given up: its frames are freed, its result is dropped when it comes, and a new
+  // keyframe is taken on the frame after that.
+  private static final long MAX_CATCH_UP_BYTES = 512L << 20;
 
   /**
    * A live keyframe's result with its tracker, run through the frames queued meanwhile (taking
@@ -267,7 +269,14 @@ public final class VideoJob {
       lastKeyframe = k;
       if (!live) {
         KeyframeWork.Result result = work.run(frame, k);
-        install(result, reason, frame, startTracker(frame, result), null);
+        long newTracker;
+        try {
+          newTracker = startTracker(frame, result);
+        } catch (RuntimeException | Error e) {
+          result.patches().release();
+          throw e;
+        }
+        install(result, reason, frame, newTracker, null);
         return;
       }
       Mat copy = frame.clone();
@@ -289,16 +298,26 @@ public final class VideoJob {
      */
     private CaughtUp catchUpOnWorker(
         KeyframeWork.Result result, Mat keyframe, BlockingQueue<Mat> queue) {
-      long tracker = startTracker(keyframe, result);
-      double[] rects = null;
-      long start = System.nanoTime();
-      for (Mat later = queue.poll(); later != null; later = queue.poll()) {
-        if (tracker != 0) {
-          rects = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+      long tracker = 0;
+      try {
+        tracker = startTracker(keyframe, result);
+        double[] rects = null;
+        long start = System.nanoTime();
+        for (Mat later = queue.poll(); later != null; later = queue.poll()) {
+          try {
+            if (tracker != 0) {
+              rects = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+            }
+          } finally {
+            later.release();
+          }
         }
-        later.release();
+        return new CaughtUp(result, tracker, rects, (System.nanoTime() - start) / 1e6);
+      } catch (RuntimeException | Error e) {
+        // Nobody will receive this result: free what it holds.
+        new CaughtUp(result, tracker, null, 0).release();
+        throw e;
       }
-      return new CaughtUp(result, tracker, rects, (System.nanoTime() - start) / 1e6);
     }
 
     /** Live: takes a finished keyframe and brings its rectangles to this frame. */
@@ -307,7 +326,7 @@ public final class VideoJob {
         return;
       }
       if (!pending.isDone()) {
-        if (catchUp.size() > MAX_CATCH_UP_FRAMES) {
+        if (catchUp.size() * frame.total() * frame.elemSize() > MAX_CATCH_UP_BYTES) {
           // Too late to catch up with: stop queueing, drop its result when it comes.
           pendingStale = true;
           releaseCatchUp();
@@ -325,19 +344,34 @@ public final class VideoJob {
       }
       timings.add("catch-up on the worker", caughtUp.catchUpMillis());
       long start = System.nanoTime();
-      double[] rects = caughtUp.rects();
-      for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
-        if (caughtUp.tracker() != 0) {
-          rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
-        }
-        later.release();
-      }
-      if (caughtUp.tracker() != 0) {
-        rects = TrackingJNI.updateTracker(caughtUp.tracker(), frame.getNativeObjAddr());
+      double[] rects;
+      try {
+        rects = catchUpHere(caughtUp, frame);
+      } catch (RuntimeException | Error e) {
+        caughtUp.release();
+        throw e;
       }
       timings.add("catch-up", (System.nanoTime() - start) / 1e6);
       install(caughtUp.result(), pendingReason, frame, caughtUp.tracker(), rects);
       latencies.add((System.nanoTime() - arrivalNanos(caughtUp.result().frame())) / 1e6);
+    }
+
+    /** Runs a caught-up tracker through the frames queued since the worker's last and frame. */
+    private double[] catchUpHere(CaughtUp caughtUp, Mat frame) {
+      double[] rects = caughtUp.rects();
+      for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
+        try {
+          if (caughtUp.tracker() != 0) {
+            rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
+          }
+        } finally {
+          later.release();
+        }
+      }
+      if (caughtUp.tracker() != 0) {
+        rects = TrackingJNI.updateTracker(caughtUp.tracker(), frame.getNativeObjAddr());
+      }
+      return rects;
     }
 
     /**
