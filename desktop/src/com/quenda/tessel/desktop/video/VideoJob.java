@@ -75,19 +75,31 @@ public final class VideoJob {
   private final KeyframeWork work;
   private final Language target;
   private final boolean live;
+  private final FrameClock clock;
 
-  /** {@code extraOcrMillis} delays every OCR run: a test hook for a slow OCR. */
+  /** {@code extraOcrMillis} delays every OCR run: a hook to try the loop with a slow OCR. */
   public VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
       long extraOcrMillis) {
-    this.work = new KeyframeWork(reader, translator, extraOcrMillis);
+    this(reader, translator, target, live, KeyframeWork.delay(extraOcrMillis), null);
+  }
+
+  /**
+   * Live with the frames arriving by {@code clock} (null: at the source's rate in real time), and
+   * {@code afterOcr} run after each OCR (tests hold the OCR up).
+   */
+  VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
+      KeyframeWork.AfterOcr afterOcr, FrameClock clock) {
+    this.work = new KeyframeWork(reader, translator, afterOcr);
     this.target = target;
     this.live = live;
+    this.clock = clock;
   }
 
   /** Runs the whole source through; {@code sink} receives every output frame. */
   public VideoResult run(FrameSource source, VideoSink sink, Progress progress)
       throws HostException {
-    Loop loop = new Loop(source, sink, progress);
+    Loop loop =
+        new Loop(source, sink, progress, clock != null ? clock : FrameClock.realTime(source.fps()));
     try {
       return loop.run();
     } finally {
@@ -105,6 +117,7 @@ public final class VideoJob {
     private final List<Map<String, Object>> keyframes = new ArrayList<>();
     private final List<Double> latencies = new ArrayList<>();
     private final ExecutorService worker;
+    private final FrameClock arrivals;
 
     private OverlayDrawer drawer;
     private long tracker;
@@ -127,7 +140,8 @@ public final class VideoJob {
     private BlockingQueue<Mat> catchUp = new LinkedBlockingQueue<>();
     private long startNanos;
 
-    Loop(FrameSource source, VideoSink sink, Progress progress) {
+    Loop(FrameSource source, VideoSink sink, Progress progress, FrameClock arrivals) {
+      this.arrivals = arrivals;
       this.source = source;
       this.sink = sink;
       this.progress = progress;
@@ -353,7 +367,7 @@ public final class VideoJob {
       }
       timings.add("catch-up", (System.nanoTime() - start) / 1e6);
       install(caughtUp.result(), pendingReason, frame, caughtUp.tracker(), rects);
-      latencies.add((System.nanoTime() - arrivalNanos(caughtUp.result().frame())) / 1e6);
+      latencies.add(arrivals.millisSince(caughtUp.result().frame()));
     }
 
     /** Runs a caught-up tracker through the frames queued since the worker's last and frame. */
@@ -587,20 +601,12 @@ public final class VideoJob {
     }
 
     private void waitForArrival(int k) throws HostException {
-      long wait = arrivalNanos(k) - System.nanoTime();
-      if (wait <= 0) {
-        return;
-      }
       try {
-        Thread.sleep(wait / 1_000_000, (int) (wait % 1_000_000));
+        arrivals.awaitFrame(k);
       } catch (InterruptedException e) {
         Thread.currentThread().interrupt();
         throw new HostException(ExitStatus.INTERNAL, "interrupted");
       }
-    }
-
-    private long arrivalNanos(int k) {
-      return startNanos + (long) (k * 1e9 / source.fps());
     }
 
     private void releaseCatchUp() {
