@@ -72,6 +72,42 @@ public final class VideoJob {
     }
   }
 
+  /**
+   * A live keyframe while the worker reads it: the result to come, why the keyframe was taken, and
+   * the frames that arrived since, which the new tracker catches up through. Given up when those
+   * frames outgrow their bound: they are freed, no more are queued, and the result is dropped when
+   * it comes.
+   */
+  private static final class LiveKeyframe {
+    final String reason;
+    final BlockingQueue<Mat> framesSince = new LinkedBlockingQueue<>();
+    Future<CaughtUp> result;
+    boolean givenUp;
+
+    LiveKeyframe(String reason) {
+      this.reason = reason;
+    }
+
+    void queue(Mat frame) {
+      if (!givenUp) {
+        framesSince.add(frame.clone());
+      }
+    }
+
+    void giveUpWhenOver(long frameBytes) {
+      if (framesSince.size() * frameBytes > MAX_CATCH_UP_BYTES) {
+        givenUp = true;
+        releaseFrames();
+      }
+    }
+
+    void releaseFrames() {
+      for (Mat frame = framesSince.poll(); frame != null; frame = framesSince.poll()) {
+        frame.release();
+      }
+    }
+  }
+
   private final KeyframeWork work;
   private final Language target;
   private final boolean live;
@@ -132,12 +168,9 @@ public final class VideoJob {
     private final Mat rgbaFrame = new Mat();
     private Mat rgbaOf;
 
-    // Live: the keyframe being worked on, the reason it was taken, and the frames since.
-    private Future<CaughtUp> pending;
-    private String pendingReason;
-    private boolean pendingStale;
+    // Live: the keyframe the worker is reading, if any; set when one was given up.
+    private LiveKeyframe working;
     private boolean retakeKeyframe;
-    private BlockingQueue<Mat> catchUp = new LinkedBlockingQueue<>();
     private long startNanos;
 
     Loop(FrameSource source, VideoSink sink, Progress progress, FrameClock arrivals) {
@@ -180,26 +213,13 @@ public final class VideoJob {
         drawer(frame); // as a phone starts its renderer with the surface, not at the first text
       }
       long start = System.nanoTime();
-      boolean lostAll = track(frame);
-      if (live) {
-        installFinishedWork(frame, k);
-      }
-      String reason = keyframeReason(frame, k, lostAll);
-      if (reason != null) {
-        takeKeyframe(frame, k, reason);
-      } else if (pending != null && !pendingStale) {
-        catchUp.add(frame.clone());
-      }
-      if (!live) {
-        eraseAgainWhereNeeded(frame);
-      }
-      Mat drawn = draw(frame, k);
+      Mat drawn = live ? liveStep(frame, k) : offlineStep(frame, k);
       double millis = (System.nanoTime() - start) / 1e6;
       timings.add("frame", millis);
       if (live && drawn != frame) {
         // What the keyframe worker costs the frame loop when both share the machine.
         timings.add(
-            pending != null ? "drawn frame, worker busy" : "drawn frame, worker idle", millis);
+            working != null ? "drawn frame, worker busy" : "drawn frame, worker idle", millis);
       }
       long encodeStart = System.nanoTime();
       sink.add(drawn);
@@ -207,6 +227,37 @@ public final class VideoJob {
         drawn.release();
       }
       timings.add("encode", (System.nanoTime() - encodeStart) / 1e6);
+    }
+
+    /**
+     * Offline, one frame in step order: track; read the frame again when the rules call for it
+     * (holding the frame up); erase again where patches went stale; draw.
+     */
+    private Mat offlineStep(Mat frame, int k) throws HostException {
+      boolean lostAll = track(frame);
+      String reason = keyframeReason(frame, k, lostAll);
+      if (reason != null) {
+        readKeyframe(frame, k, reason);
+      }
+      eraseAgainWhereNeeded(frame);
+      return draw(frame, k);
+    }
+
+    /**
+     * Live, one frame in step order, never waiting for the worker: track; take over a keyframe the
+     * worker has finished; start a keyframe when the rules call for it, or queue the frame for the
+     * one being read; draw.
+     */
+    private Mat liveStep(Mat frame, int k) throws HostException {
+      boolean lostAll = track(frame);
+      installFinishedWork(frame);
+      String reason = keyframeReason(frame, k, lostAll);
+      if (reason != null) {
+        startKeyframe(frame, k, reason);
+      } else if (working != null) {
+        working.queue(frame);
+      }
+      return draw(frame, k);
     }
 
     /** Step 1: moves the shown lines into this frame; true when the tracker lost all of them. */
@@ -233,7 +284,7 @@ public final class VideoJob {
 
     /** Step 2: why this frame must be read again, or null. */
     private String keyframeReason(Mat frame, int k, boolean lostAll) {
-      if (pending != null) {
+      if (working != null) {
         return null;
       }
       if (lastKeyframe == Integer.MIN_VALUE) {
@@ -279,31 +330,33 @@ public final class VideoJob {
       return rgbaFrame;
     }
 
-    private void takeKeyframe(Mat frame, int k, String reason) throws HostException {
+    /** Offline: reads the frame, translates and erases its lines, and tracks them from here. */
+    private void readKeyframe(Mat frame, int k, String reason) throws HostException {
       lastKeyframe = k;
-      if (!live) {
-        KeyframeWork.Result result = work.run(frame, k);
-        long newTracker;
-        try {
-          newTracker = startTracker(frame, result);
-        } catch (RuntimeException | Error e) {
-          result.patches().release();
-          throw e;
-        }
-        install(result, reason, frame, newTracker, null);
-        return;
+      KeyframeWork.Result result = work.run(frame, k);
+      long newTracker;
+      try {
+        newTracker = startTracker(frame, result);
+      } catch (RuntimeException | Error e) {
+        result.patches().release();
+        throw e;
       }
+      install(result, reason, frame, newTracker, null);
+    }
+
+    /** Live: hands a copy of the frame to the worker; the frames after it are queued for it. */
+    private void startKeyframe(Mat frame, int k, String reason) {
+      lastKeyframe = k;
+      LiveKeyframe keyframe = new LiveKeyframe(reason);
       Mat copy = frame.clone();
-      BlockingQueue<Mat> queue = new LinkedBlockingQueue<>();
-      catchUp = queue;
-      pendingReason = reason;
-      pending = worker.submit(() -> {
+      keyframe.result = worker.submit(() -> {
         try {
-          return catchUpOnWorker(work.run(copy, k), copy, queue);
+          return catchUpOnWorker(work.run(copy, k), copy, keyframe.framesSince);
         } finally {
           copy.release();
         }
       });
+      working = keyframe;
     }
 
     /**
@@ -334,25 +387,21 @@ public final class VideoJob {
       }
     }
 
-    /** Live: takes a finished keyframe and brings its rectangles to this frame. */
-    private void installFinishedWork(Mat frame, int k) throws HostException {
-      if (pending == null) {
+    /** Live: takes a finished keyframe over and brings its rectangles to this frame. */
+    private void installFinishedWork(Mat frame) throws HostException {
+      if (working == null) {
         return;
       }
-      if (!pending.isDone()) {
-        if (catchUp.size() * frame.total() * frame.elemSize() > MAX_CATCH_UP_BYTES) {
-          // Too late to catch up with: stop queueing, drop its result when it comes.
-          pendingStale = true;
-          releaseCatchUp();
-        }
+      if (!working.result.isDone()) {
+        working.giveUpWhenOver(frame.total() * frame.elemSize());
         return;
       }
-      CaughtUp caughtUp = result(pending);
-      pending = null;
-      if (pendingStale) {
-        pendingStale = false;
+      LiveKeyframe done = working;
+      working = null;
+      CaughtUp caughtUp = result(done.result);
+      if (done.givenUp) {
         caughtUp.release();
-        releaseCatchUp();
+        done.releaseFrames();
         retakeKeyframe = true;
         return;
       }
@@ -360,20 +409,21 @@ public final class VideoJob {
       long start = System.nanoTime();
       double[] rects;
       try {
-        rects = catchUpHere(caughtUp, frame);
+        rects = catchUpHere(caughtUp, done.framesSince, frame);
       } catch (RuntimeException | Error e) {
         caughtUp.release();
+        done.releaseFrames();
         throw e;
       }
       timings.add("catch-up", (System.nanoTime() - start) / 1e6);
-      install(caughtUp.result(), pendingReason, frame, caughtUp.tracker(), rects);
+      install(caughtUp.result(), done.reason, frame, caughtUp.tracker(), rects);
       latencies.add(arrivals.millisSince(caughtUp.result().frame()));
     }
 
-    /** Runs a caught-up tracker through the frames queued since the worker's last and frame. */
-    private double[] catchUpHere(CaughtUp caughtUp, Mat frame) {
+    /** Runs a caught-up tracker through the frames queued after the worker's last, then frame. */
+    private double[] catchUpHere(CaughtUp caughtUp, BlockingQueue<Mat> queued, Mat frame) {
       double[] rects = caughtUp.rects();
-      for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
+      for (Mat later = queued.poll(); later != null; later = queued.poll()) {
         try {
           if (caughtUp.tracker() != 0) {
             rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
@@ -609,12 +659,6 @@ public final class VideoJob {
       }
     }
 
-    private void releaseCatchUp() {
-      for (Mat frame = catchUp.poll(); frame != null; frame = catchUp.poll()) {
-        frame.release();
-      }
-    }
-
     private void releaseShown() {
       shown.forEach(ShownLine::release);
     }
@@ -623,14 +667,16 @@ public final class VideoJob {
       if (worker != null) {
         worker.shutdownNow();
         try {
-          if (pending != null) {
-            pending.get().release();
+          if (working != null) {
+            working.result.get().release();
           }
         } catch (InterruptedException | ExecutionException | RuntimeException e) {
           // The worker failed or was stopped; it holds nothing more to free.
         }
       }
-      releaseCatchUp();
+      if (working != null) {
+        working.releaseFrames();
+      }
       releaseShown();
       if (tracker != 0) {
         TrackingJNI.releaseTracker(tracker);
