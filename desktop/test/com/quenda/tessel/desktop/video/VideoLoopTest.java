@@ -194,7 +194,7 @@ class VideoLoopTest {
         if (k == releaseAt) {
           ocrMayFinish.countDown();
         } else if (k > releaseAt) {
-          Thread.sleep(100); // time for translating, erasing and catching up
+          Thread.sleep(150); // time for translating, erasing and catching up, also under ASan
         }
       }
 
