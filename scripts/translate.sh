@@ -1,6 +1,8 @@
 #!/usr/bin/env bash
-# Translates photos in place with real OCR and machine translation, offline:
+# Translates photos and videos in place with real OCR and machine
+# translation, offline:
 #   ./scripts/translate.sh photo IMAGE... --from en --to es --out DIR
+#   ./scripts/translate.sh video VIDEO_OR_FRAME_FOLDER --from en --to es --out DIR [--live]
 # Installs what is missing and builds on first use (quietly; the build's
 # output goes to build/build.log), then runs the desktop host.
 set -euo pipefail

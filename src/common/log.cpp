@@ -38,17 +38,20 @@ std::string FormatMessage(const char* format, va_list args) {
 
 }  // namespace
 
-void Print(int priority, const char* format, ...) {
+void Print(int priority, const char* format, ...) noexcept {
   va_list args;
   va_start(args, format);
-  const std::string text = FormatMessage(format, args);
+  try {
+    const std::string text = FormatMessage(format, args);
+    platform::WriteLog(priority, kTag, text.c_str());
+    std::lock_guard<std::mutex> lock(CapturesMutex());
+    for (ScopedCapture* capture : ActiveCaptures())
+      capture->Append(priority, text);
+  } catch (...) {
+    // Out of memory (or a lock that failed): the message is lost, the caller
+    // goes on.
+  }
   va_end(args);
-
-  platform::WriteLog(priority, kTag, text.c_str());
-
-  std::lock_guard<std::mutex> lock(CapturesMutex());
-  for (ScopedCapture* capture : ActiveCaptures())
-    capture->Append(priority, text);
 }
 
 struct ScopedCapture::State {

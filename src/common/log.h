@@ -16,7 +16,10 @@ enum Priority : int {
   kError = 6,
 };
 
-void Print(int priority, const char* format, ...) __attribute__((format(printf, 2, 3)));
+// Never throws: a message that cannot be formatted or stored for lack of
+// memory is dropped, so that a log line can stand anywhere, also in a catch
+// handler or a bridge function outside any guard.
+void Print(int priority, const char* format, ...) noexcept __attribute__((format(printf, 2, 3)));
 
 // One formatted message as it reached the log.
 struct Record {

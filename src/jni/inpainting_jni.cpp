@@ -51,8 +51,8 @@ jint InpaintingRotRectImg(JNIEnv* env, jlong image_address, jlongArray output_ad
     return -1;
   }
   // The entry insists on a copy of the rectangles; a VM that hands out the
-  // array in place is treated as an error.
-  ArrayElements<jdoubleArray> rect_elements(env, rects, OnRelease::kCopyBack);
+  // array in place is treated as an error. Only read, so never copied back.
+  ArrayElements<jdoubleArray> rect_elements(env, rects, OnRelease::kDiscard);
   if (!rect_elements || !rect_elements.is_copy()) {
     OCR_LOGE(" Inpainting_Process: Error in copy rectangles in Java call");
     return -1;
@@ -73,7 +73,7 @@ jint InpaintingRotRectImg(JNIEnv* env, jlong image_address, jlongArray output_ad
         "doesn't match the number of rectangles");
     return -1;
   }
-  ArrayElements<jlongArray> address_elements(env, output_addresses, OnRelease::kCopyBack);
+  ArrayElements<jlongArray> address_elements(env, output_addresses, OnRelease::kDiscard);
   if (!address_elements || !address_elements.is_copy()) {
     OCR_LOGE(" Inpainting_Process: Error in copy output matrix addresses in Java call");
     return -1;
@@ -90,8 +90,11 @@ jint InpaintingRotRectImg(JNIEnv* env, jlong image_address, jlongArray output_ad
 
   OCR_LOGI("Inpainting_Process: Start vector images, call inpaintRotImg");
   // Binds the debug image writer to the host's class loader, so that the
-  // pipeline's worker threads can dump images.
-  ImageWriter::getInstance().EnsureInit(env);
+  // pipeline's worker threads can dump images. A Java exception it leaves
+  // pending (the host's classes could not be looked up) is the host's answer:
+  // no further JNI call may follow it, so the request stops here.
+  if (!ImageWriter::getInstance().EnsureInit(env) && env->ExceptionCheck())
+    return -1;
 
   std::vector<int32_t> packed_colors;
   const int status = ocr_inpainting::AnswerInpaintingRequest(InputImage(image_address), rect_values,

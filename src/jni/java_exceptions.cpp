@@ -2,6 +2,7 @@
 
 #include <exception>
 #include <new>
+#include <stdexcept>
 
 #include <opencv2/core.hpp>
 
@@ -35,6 +36,8 @@ void ThrowCurrentExceptionToJava(JNIEnv* env) noexcept {
       ThrowNew(env, "java/lang/RuntimeException", error.what());
   } catch (const std::bad_alloc& error) {
     ThrowNew(env, "java/lang/OutOfMemoryError", error.what());
+  } catch (const std::invalid_argument& error) {
+    ThrowNew(env, "java/lang/IllegalArgumentException", error.what());
   } catch (const std::exception& error) {
     ThrowNew(env, "java/lang/RuntimeException", error.what());
   } catch (...) {

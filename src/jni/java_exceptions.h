@@ -8,7 +8,9 @@ namespace ocr::jni {
 
 // Makes the C++ exception being handled the host's pending Java exception:
 // cv::Exception becomes org.opencv.core.CvException (what OpenCV's own Java
-// binding throws), std::bad_alloc java.lang.OutOfMemoryError, anything else
+// binding throws), std::bad_alloc java.lang.OutOfMemoryError,
+// std::invalid_argument (a host's call the engine refuses, such as address 0
+// for a required matrix) java.lang.IllegalArgumentException, anything else
 // java.lang.RuntimeException; the message is what() where there is one. A
 // Java exception already pending (from a failed JNI call) is left as it is.
 // Call only from inside a catch block.

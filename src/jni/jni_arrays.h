@@ -38,10 +38,11 @@ enum class OnRelease : jint {
 };
 
 // The elements of a primitive Java array, pinned or copied by the VM. A null
-// array gives no elements. The release mode is chosen where the elements are
-// taken, so every path out of the bridge function releases them the same
-// way; Release frees them early, Discard frees them early without copying
-// back whatever the mode (a call that failed after writing nothing).
+// array, or one the VM could not pin or copy, gives no elements and size 0,
+// so that a loop over size() never reads through a null pointer. The release mode is chosen where
+// the elements are taken, so every path out of the bridge function releases them the same way;
+// Release frees them early, Discard frees them early without copying back whatever the mode (a call
+// that failed after writing nothing).
 template <typename ArrayT>
 class ArrayElements {
  public:
@@ -50,7 +51,8 @@ class ArrayElements {
   ArrayElements(JNIEnv* env, ArrayT array, OnRelease mode) : env_(env), array_(array), mode_(mode) {
     if (array_ != nullptr) {
       elements_ = ArrayTraits<ArrayT>::Get(env_, array_, &is_copy_);
-      length_ = static_cast<size_t>(env_->GetArrayLength(array_));
+      if (elements_ != nullptr)
+        length_ = static_cast<size_t>(env_->GetArrayLength(array_));
     }
   }
   ~ArrayElements() { Release(); }

@@ -39,7 +39,8 @@ jlong HandleOf(zeph::OcrTrackerRotRect* tracker) {
 // toward zero, as the host's OCR boxes have always been read.
 std::vector<cv::RotatedRect> ReadRects(JNIEnv* env, jdoubleArray array) {
   std::vector<cv::RotatedRect> rects;
-  ocr::jni::ArrayElements<jdoubleArray> values(env, array, ocr::jni::OnRelease::kCopyBack);
+  // Only read: released without copying back.
+  ocr::jni::ArrayElements<jdoubleArray> values(env, array, ocr::jni::OnRelease::kDiscard);
   const size_t count = values.size() / kValsPerRect;
   rects.reserve(count);
   if (values.size() >= static_cast<size_t>(kValsPerRect)) {
@@ -123,15 +124,17 @@ JNIEXPORT void JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_releaseTracke
 JNIEXPORT jdouble JNICALL Java_com_quenda_tessel_tracking_TrackingJNI_calculateFrameAccuracy(
     JNIEnv* env, jclass, jlong first_addr, jlong second_addr) {
   return CallPassingExceptionsToJava(env, jdouble{0.0}, [&] {
-    return zeph::CalculateFrameAccuracy(ocr::jni::HostMat(first_addr),
-                                        ocr::jni::HostMat(second_addr));
+    return zeph::CalculateFrameAccuracy(
+        ocr::jni::RequiredHostMat(first_addr, "calculateFrameAccuracy"),
+        ocr::jni::RequiredHostMat(second_addr, "calculateFrameAccuracy"));
   });
 }
 
 JNIEXPORT jdouble JNICALL
 Java_com_quenda_tessel_tracking_TrackingJNI_calculateBlur(JNIEnv* env, jclass, jlong mat_addr) {
-  return CallPassingExceptionsToJava(
-      env, jdouble{0.0}, [&] { return image_quality::CalculateBlur(ocr::jni::HostMat(mat_addr)); });
+  return CallPassingExceptionsToJava(env, jdouble{0.0}, [&] {
+    return image_quality::CalculateBlur(ocr::jni::RequiredHostMat(mat_addr, "calculateBlur"));
+  });
 }
 
 }  // extern "C"

@@ -102,15 +102,15 @@ JNIEXPORT void JNICALL Java_org_vexel_android_VexelJNI_renderOneFrame(
   const cv::Mat* image = ocr::jni::HostMatOrNull(imageMatAddr);
   const std::size_t text_count =
       texts != nullptr ? static_cast<std::size_t>(env->GetArrayLength(texts)) : 0;
-  // Pinned for the call and copied back on release, as the host expects of
-  // every array it hands to this call.
-  const ArrayElements<jdoubleArray> patch_rects(env, patchRects, OnRelease::kCopyBack);
-  const ArrayElements<jdoubleArray> text_rects(env, textRects, OnRelease::kCopyBack);
-  const ArrayElements<jlongArray> id_values(env, ids, OnRelease::kCopyBack);
-  const ArrayElements<jlongArray> patch_addresses(env, patchMatAddrs, OnRelease::kCopyBack);
-  const ArrayElements<jdoubleArray> scales(env, colorScales, OnRelease::kCopyBack);
-  const ArrayElements<jdoubleArray> shifts(env, colorShifts, OnRelease::kCopyBack);
-  const ArrayElements<jintArray> colour_values(env, colors, OnRelease::kCopyBack);
+  // Pinned for the call and only read: released without copying back, so a
+  // VM that copied them has nothing to write into the host's arrays.
+  const ArrayElements<jdoubleArray> patch_rects(env, patchRects, OnRelease::kDiscard);
+  const ArrayElements<jdoubleArray> text_rects(env, textRects, OnRelease::kDiscard);
+  const ArrayElements<jlongArray> id_values(env, ids, OnRelease::kDiscard);
+  const ArrayElements<jlongArray> patch_addresses(env, patchMatAddrs, OnRelease::kDiscard);
+  const ArrayElements<jdoubleArray> scales(env, colorScales, OnRelease::kDiscard);
+  const ArrayElements<jdoubleArray> shifts(env, colorShifts, OnRelease::kDiscard);
+  const ArrayElements<jintArray> colour_values(env, colors, OnRelease::kDiscard);
 
   ocr_ar::FrameArrays arrays;
   arrays.patch_rects = View<double>(patch_rects);

@@ -79,10 +79,40 @@ JNINativeInterface_ MakeFunctions() {
     ++ArrayOf(array).region_writes;
     std::copy(values, values + length, ArrayOf(array).ints.begin() + start);
   };
+  f.ExceptionCheck = [](JNIEnv*) -> jboolean { return JNI_FALSE; };
   // No VM behind this environment: the image writer stays uninitialised.
   f.GetJavaVM = [](JNIEnv*, JavaVM** vm) -> jint {
     *vm = nullptr;
     return JNI_ERR;
+  };
+  return f;
+}
+
+// A VM whose application classes cannot be found: the image writer's lookup
+// leaves a NoClassDefFoundError pending, and any JNI call after that is
+// counted (a real VM's behaviour is undefined then).
+struct ClasslessVm {
+  bool pending = false;
+  int calls_while_pending = 0;
+};
+ClasslessVm* g_classless = nullptr;
+
+JNINativeInterface_ MakeClasslessFunctions() {
+  JNINativeInterface_ f = MakeFunctions();
+  f.GetJavaVM = [](JNIEnv*, JavaVM** vm) -> jint {
+    *vm = reinterpret_cast<JavaVM*>(g_classless);  // never used as a VM
+    return JNI_OK;
+  };
+  f.FindClass = [](JNIEnv*, const char*) -> jclass {
+    g_classless->pending = true;
+    return nullptr;
+  };
+  f.ExceptionCheck = [](JNIEnv*) -> jboolean {
+    return g_classless->pending ? JNI_TRUE : JNI_FALSE;
+  };
+  f.SetIntArrayRegion = [](JNIEnv*, jintArray array, jsize, jsize, const jint*) {
+    g_classless->calls_while_pending += g_classless->pending ? 1 : 0;
+    ++ArrayOf(array).region_writes;
   };
   return f;
 }
@@ -157,9 +187,24 @@ TEST_F(InpaintingBridgeTest, AnswersIntoTheHostsMatsAndReleasesEveryArray) {
   EXPECT_EQ(outputs_[0].size(), cv::Size(130, 40));
   EXPECT_EQ(colours_->region_writes, 1);
   EXPECT_EQ(static_cast<uint32_t>(colours_->ints[0]) >> 24, 0xFFu);
-  EXPECT_EQ(rects.release_modes, std::vector<jint>{0});
-  EXPECT_EQ(addresses_->release_modes, std::vector<jint>{0});
+  // Both arrays are only read: released without copying back.
+  EXPECT_EQ(rects.release_modes, std::vector<jint>{JNI_ABORT});
+  EXPECT_EQ(addresses_->release_modes, std::vector<jint>{JNI_ABORT});
   EXPECT_TRUE(Balanced());
+}
+
+TEST_F(InpaintingBridgeTest, AJavaExceptionFromBindingTheImageWriterEndsTheRequestThere) {
+  ClasslessVm vm;
+  g_classless = &vm;
+  functions_ = MakeClasslessFunctions();
+  FakeArray& rects = Array(one_rect_);
+  EXPECT_EQ(Inpaint(rects, 1, 1), -1);
+  EXPECT_TRUE(vm.pending);  // the host receives the VM's own exception
+  EXPECT_EQ(vm.calls_while_pending, 0);
+  EXPECT_EQ(colours_->region_writes, 0);
+  EXPECT_TRUE(capture_.Contains("ImageWriter: Exception getting ClassLoader", ocr::log::kError));
+  EXPECT_TRUE(Balanced());
+  g_classless = nullptr;
 }
 
 TEST_F(InpaintingBridgeTest, InsistsOnCopiesAndReleasesWhatItTookOnEveryRefusal) {
@@ -179,7 +224,7 @@ TEST_F(InpaintingBridgeTest, InsistsOnCopiesAndReleasesWhatItTookOnEveryRefusal)
   FakeArray& rects = Array(one_rect_);
   EXPECT_EQ(Inpaint(rects, 1, 1, /*addresses_in_place=*/true), -1);
   ExpectRefused(" Inpainting_Process: Error in copy output matrix addresses in Java call");
-  EXPECT_EQ(rects.release_modes, std::vector<jint>{0});
+  EXPECT_EQ(rects.release_modes, std::vector<jint>{JNI_ABORT});
 
   // The colour count is checked before the addresses are taken.
   EXPECT_EQ(Inpaint(Array(one_rect_), 2, 1), -1);

@@ -86,6 +86,11 @@ TEST_F(JavaExceptionsTest, EachKindOfExceptionBecomesItsJavaClassWithWhatAsMessa
   EXPECT_EQ(vm_.thrown->message, std::string(std::bad_alloc().what()));
 
   vm_ = {};
+  Call([]() -> int { throw std::invalid_argument("calculateBlur: no matrix at address 0"); });
+  EXPECT_EQ(vm_.thrown->class_name, "java/lang/IllegalArgumentException");
+  EXPECT_EQ(vm_.thrown->message, std::string("calculateBlur: no matrix at address 0"));
+
+  vm_ = {};
   Call([]() -> int { throw std::length_error("vector too long"); });
   EXPECT_EQ(vm_.thrown->class_name, "java/lang/RuntimeException");
   EXPECT_EQ(vm_.thrown->message, std::string("vector too long"));

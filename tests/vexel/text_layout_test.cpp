@@ -105,6 +105,28 @@ TEST_F(TextLayoutTest, ArabicLettersJoin) {
   EXPECT_NE(joined.glyphs[1].glyph, alone.glyphs[0].glyph);
 }
 
+// A wrapped paragraph must lay out in time linear in its length. Alternating
+// scripts in a container a quarter em wide make one run and one line per
+// character; a layout that visits the whole paragraph for every line (as it
+// once did) needs hours for this text, past any test timeout, while a linear
+// one takes seconds. The length is what makes this test able to fail.
+TEST_F(TextLayoutTest, AParagraphWrappedAtEveryCharacterLaysOutInLinearTime) {
+  const std::shared_ptr<FontFace> cjk = Face("NotoSansCJK-Regular.ttc");
+  constexpr std::size_t kPairs = 500000;
+  std::u32string text;
+  text.reserve(2 * kPairs);
+  for (std::size_t i = 0; i < kPairs; ++i)
+    text += U"a\u5B57";
+  LayoutParams params;
+  params.container = Rect(0.0f, 0.0f, 0.25f, -1.0f);
+  params.line = cjk->ReferenceLineMetrics(0xFF41);
+  const TextLayout layout = LayOutText(text, *cjk, params);
+  ASSERT_EQ(layout.glyphs.size(), 2 * kPairs);
+  // One character per line, each line below the one before.
+  EXPECT_GT(layout.glyphs[0].y, layout.glyphs[1].y);
+  EXPECT_GT(layout.glyphs[2 * kPairs - 2].y, layout.glyphs[2 * kPairs - 1].y);
+}
+
 TEST(DistanceFieldTest, EncodesSignedPixelDistancesAroundTheOutline) {
   // A 10 x 10 filled square whose left column is half covered.
   std::vector<std::uint8_t> coverage(100, 255);

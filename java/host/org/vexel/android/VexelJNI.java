@@ -60,7 +60,11 @@ public final class VexelJNI {
    * @param patchRects 5 values per text (centre x, centre y, width, height, angle in degrees) in
    *     image pixels: where the patch was cut
    * @param textRects 5 values per text: where the text is drawn
-   * @param ids per text the id of its region; a patch is uploaded again only when it changes
+   * @param ids per text the id of its patch's content. The renderer keeps each text's patch
+   *     between frames and takes new pixels only when the id differs from the one it holds for
+   *     that text (a new texture only when the size changes too). So every new patch needs a new
+   *     id, also a patch cut again for the same line (in new light, say): under the old id the old
+   *     pixels stay on screen. Only the low 32 bits count.
    * @param patchMatAddrs per text the native address of its RGBA patch matrix
    * @param colorScales 3 per text: per-channel multipliers of patch and text colour, or null
    * @param colorShifts 3 per text: per-channel offsets (0..255 units), or null

@@ -7,6 +7,8 @@ import static org.junit.jupiter.api.Assertions.assertThrows;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import java.io.IOException;
+import java.lang.reflect.InvocationTargetException;
+import java.lang.reflect.Method;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
@@ -41,5 +43,22 @@ class DirectoryAssetManagerTest {
     }
     assertThrows(IllegalArgumentException.class,
         () -> new DirectoryAssetManager(directory.resolve("none").toString()));
+  }
+
+  @Test
+  void nullNamesAreNullPointerExceptionsNotCrashes() throws ReflectiveOperationException {
+    try (DirectoryAssetManager assets = new DirectoryAssetManager(directory.toString())) {
+      assertEquals(
+          "name", assertThrows(NullPointerException.class, () -> assets.read(null)).getMessage());
+      assertNull(assets.read("missing.txt"));
+    }
+    // The constructor checks its directory in Java first; the native side
+    // must hold on its own.
+    Method create = DirectoryAssetManager.class.getDeclaredMethod("nativeCreate", String.class);
+    create.setAccessible(true);
+    InvocationTargetException thrown =
+        assertThrows(InvocationTargetException.class, () -> create.invoke(null, (Object) null));
+    assertEquals(NullPointerException.class, thrown.getCause().getClass());
+    assertEquals("directory", thrown.getCause().getMessage());
   }
 }

@@ -4,6 +4,7 @@ import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertFalse;
 import static org.junit.jupiter.api.Assertions.assertThrows;
 import static org.junit.jupiter.api.Assertions.assertTrue;
+import static org.junit.jupiter.api.Assumptions.assumeTrue;
 
 import org.junit.jupiter.api.Test;
 import org.vexel.KitProbe;
@@ -32,5 +33,18 @@ class OffscreenSurfaceTest {
     assertFalse(KitProbe.drawBackground(closed, 0));
     assertThrows(IllegalStateException.class, closed::readPixels);
     assertThrows(IllegalArgumentException.class, () -> new OffscreenSurface(-1, 4));
+  }
+
+  @Test
+  void aSurfaceTooLargeForMemoryIsAnOutOfMemoryErrorNotARefusedSize() {
+    // AddressSanitizer's allocator ends the process where the normal one throws.
+    assumeTrue(System.getenv("ASAN_OPTIONS") == null, "not under AddressSanitizer");
+    // Four terabytes of pixels: more than any machine this runs on commits.
+    OutOfMemoryError error =
+        assertThrows(OutOfMemoryError.class, () -> new OffscreenSurface(1_000_000, 1_000_000));
+    assertEquals("std::bad_alloc", error.getMessage());
+    try (OffscreenSurface surface = new OffscreenSurface(2, 2)) {
+      assertEquals(16, surface.readPixels().length);
+    }
   }
 }

@@ -40,7 +40,9 @@ public final class ChildProcess {
    * Runs {@code command} with {@code input} on its standard input (UTF-8) and the extra
    * environment variables; throws IOException when it cannot be started (not installed), and
    * CHILD_FAILED naming the {@code role} of the program ("OCR", "translation") when it has not
-   * finished after {@code timeoutMillis}.
+   * finished after {@code timeoutMillis}, counted from its start: a child that stops reading its
+   * input is stopped in time too. Stopping it kills every process it started (a launcher script's
+   * pipeline), not just the first.
    */
   public static Result run(String role, List<String> command, String input,
       Map<String, String> environment, long timeoutMillis) throws IOException, HostException {
@@ -49,18 +51,14 @@ public final class ChildProcess {
     Process process = builder.start();
     ByteArrayOutputStream out = new ByteArrayOutputStream();
     ByteArrayOutputStream err = new ByteArrayOutputStream();
-    // Both pipes drain on their own threads: a child blocked on a full pipe would never exit.
+    // Every pipe on its own thread: a child blocked on a full pipe would never exit, and a child
+    // that never reads would block the writer.
     Thread outReader = drain(process.getInputStream(), out);
     Thread errReader = drain(process.getErrorStream(), err);
-    try (OutputStream stdin = process.getOutputStream()) {
-      stdin.write(input.getBytes(StandardCharsets.UTF_8));
-    } catch (IOException e) {
-      // The child closed its input early; its exit status and error output tell why.
-    }
+    feed(process.getOutputStream(), input.getBytes(StandardCharsets.UTF_8));
     try {
       if (!process.waitFor(timeoutMillis, TimeUnit.MILLISECONDS)) {
-        process.destroyForcibly();
-        process.waitFor();
+        killWithDescendants(process);
         throw new HostException(ExitStatus.CHILD_FAILED,
             String.format("the %s program '%s' did not finish within %d ms and was stopped", role,
                 command.get(0), timeoutMillis));
@@ -68,12 +66,36 @@ public final class ChildProcess {
       outReader.join();
       errReader.join();
     } catch (InterruptedException e) {
-      process.destroyForcibly();
+      killWithDescendants(process);
       Thread.currentThread().interrupt();
       throw new HostException(ExitStatus.INTERNAL, "interrupted while " + command.get(0) + " ran");
     }
     return new Result(process.exitValue(), out.toString(StandardCharsets.UTF_8),
         err.toString(StandardCharsets.UTF_8));
+  }
+
+  /** Kills the process and everything it started, children first so that none is orphaned. */
+  private static void killWithDescendants(Process process) {
+    process.descendants().forEach(ProcessHandle::destroyForcibly);
+    process.destroyForcibly();
+    try {
+      process.waitFor();
+    } catch (InterruptedException e) {
+      Thread.currentThread().interrupt();
+    }
+  }
+
+  private static void feed(OutputStream stdin, byte[] input) {
+    Thread writer = new Thread(() -> {
+      try (OutputStream in = stdin) {
+        in.write(input);
+      } catch (IOException e) {
+        // The child closed its input early or was stopped; its exit status and error output
+        // tell why.
+      }
+    });
+    writer.setDaemon(true);
+    writer.start();
   }
 
   private static Thread drain(InputStream stream, ByteArrayOutputStream sink) {

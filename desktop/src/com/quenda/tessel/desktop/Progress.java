@@ -1,6 +1,9 @@
 package com.quenda.tessel.desktop;
 
+import java.io.IOException;
 import java.io.PrintStream;
+import java.nio.file.Files;
+import java.nio.file.Path;
 
 /**
  * A progress bar on the terminal for work that takes longer than a second: nothing is shown
@@ -23,7 +26,20 @@ public final class Progress {
   public Progress(int total, boolean quiet, PrintStream err) {
     this.total = Math.max(total, 1);
     this.err = err;
-    this.enabled = !quiet && System.console() != null;
+    this.enabled = !quiet && standardErrorIsTerminal();
+  }
+
+  /**
+   * Whether descriptor 2 is a terminal. Not System.console(): that also asks for standard output,
+   * which the launcher sends to a file (the engine's tracker prints there).
+   */
+  static boolean standardErrorIsTerminal() {
+    try {
+      String device = Files.readSymbolicLink(Path.of("/proc/self/fd/2")).toString();
+      return device.startsWith("/dev/pts/") || device.startsWith("/dev/tty");
+    } catch (IOException | UnsupportedOperationException | SecurityException e) {
+      return false;
+    }
   }
 
   /** One more step is done; {@code what} names the one that starts now. */

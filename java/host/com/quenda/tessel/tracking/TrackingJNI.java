@@ -54,6 +54,8 @@ public final class TrackingJNI {
    * red/green distributions, down to -1.0.
    *
    * @throws org.opencv.core.CvException for an empty frame or one of another channel count
+   * @throws IllegalArgumentException for address 0: "calculateFrameAccuracy: no matrix at address
+   *     0"
    */
   public static native double calculateFrameAccuracy(long firstMatAddr, long secondMatAddr);
 
@@ -61,6 +63,7 @@ public final class TrackingJNI {
    * Sharpness of an RGBA frame: standard deviation of its Laplacian (small when blurred).
    *
    * @throws org.opencv.core.CvException for an empty frame or one of another channel count
+   * @throws IllegalArgumentException for address 0: "calculateBlur: no matrix at address 0"
    */
   public static native double calculateBlur(long matAddr);
 }

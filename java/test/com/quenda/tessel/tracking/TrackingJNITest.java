@@ -134,6 +134,25 @@ class TrackingJNITest {
     Reference.reachabilityFence(dot);
   }
 
+  @Test
+  void measuringAtAddressZeroIsTheHostsBugAndReachesItAsAnException() {
+    Mat frame = new Mat(20, 30, CvType.CV_8UC4, new Scalar(9, 9, 9, 255));
+    long address = frame.getNativeObjAddr();
+    assertEquals("calculateBlur: no matrix at address 0",
+        assertThrows(IllegalArgumentException.class, () -> TrackingJNI.calculateBlur(0))
+            .getMessage());
+    for (long[] pair : new long[][] {{0, address}, {address, 0}, {0, 0}}) {
+      assertEquals("calculateFrameAccuracy: no matrix at address 0",
+          assertThrows(IllegalArgumentException.class,
+              () -> TrackingJNI.calculateFrameAccuracy(pair[0], pair[1]))
+              .getMessage());
+    }
+    // The JVM lives on and the measures still answer for real matrices.
+    assertEquals(1.0, TrackingJNI.calculateFrameAccuracy(address, address), 0.0);
+    assertEquals(0.0, TrackingJNI.calculateBlur(address), 0.0);
+    Reference.reachabilityFence(frame);
+  }
+
   /** Checks that the call raised OpenCV's own error, word for word as OpenCV worded it. */
   private static void openCvError(Executable call, String detail) {
     String message = assertThrows(CvException.class, call).getMessage();

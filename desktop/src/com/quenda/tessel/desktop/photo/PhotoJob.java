@@ -40,6 +40,15 @@ public final class PhotoJob {
   /** The photo translated; the caller releases the result's images. */
   public PhotoResult run(PhotoInput input, Progress progress) throws HostException {
     Mat rgb = input.decode();
+    try {
+      return translate(input, rgb, progress);
+    } catch (HostException | RuntimeException | Error e) {
+      rgb.release(); // only a result takes the decoded image over
+      throw e;
+    }
+  }
+
+  private PhotoResult translate(PhotoInput input, Mat rgb, Progress progress) throws HostException {
     StageTimes times = new StageTimes();
 
     progress.show(input.name + ": reading the text");

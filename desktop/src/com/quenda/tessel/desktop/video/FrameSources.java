@@ -41,6 +41,9 @@ public final class FrameSources {
   }
 
   private static FrameSource file(Path path) throws HostException {
+    if (isEmptyFile(path)) {
+      throw new HostException(ExitStatus.EMPTY_IMAGE, path + ": the file is empty");
+    }
     VideoCapture capture = new VideoCapture(path.toString());
     if (!capture.isOpened()) {
       capture.release();
@@ -154,6 +157,14 @@ public final class FrameSources {
     @Override
     public String name() {
       return name;
+    }
+  }
+
+  private static boolean isEmptyFile(Path path) throws HostException {
+    try {
+      return Files.size(path) == 0;
+    } catch (IOException e) {
+      throw new HostException(ExitStatus.NO_INPUT, path + ": cannot be read");
     }
   }
 

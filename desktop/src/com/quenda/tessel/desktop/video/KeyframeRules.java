@@ -18,7 +18,8 @@ import org.opencv.core.RotatedRect;
  * tracked place it is scaled, turned and colour-corrected by the renderer. Past a quarter more or
  * less in size, 10 degrees of turn or a light change of a third in any channel, the stretched
  * patch no longer passes for the surface under it, and the line is erased again from the current
- * frame, keeping its text, translation and id.
+ * frame, keeping its text, translation and line id (the new patch gets an id of its own, so that
+ * the renderer takes its pixels).
  */
 public final class KeyframeRules {
   static final double MIN_COVERAGE = 0.6;
@@ -36,7 +37,7 @@ public final class KeyframeRules {
     if (scale > MAX_SCALE_CHANGE || scale < 1 / MAX_SCALE_CHANGE) {
       return true;
     }
-    if (Math.abs(now.angle - erasedAt.angle) > MAX_TURN_DEGREES) {
+    if (turnDegrees(erasedAt.angle, now.angle) > MAX_TURN_DEGREES) {
       return true;
     }
     for (double gain : gains) {
@@ -45,5 +46,14 @@ public final class KeyframeRules {
       }
     }
     return false;
+  }
+
+  /**
+   * How far a line turned from {@code fromDegrees} to {@code toDegrees}, 0..180: the short way
+   * round, so that 179 and -179 are 2 degrees apart, not 358.
+   */
+  static double turnDegrees(double fromDegrees, double toDegrees) {
+    double turn = Math.abs(toDegrees - fromDegrees) % 360;
+    return turn > 180 ? 360 - turn : turn;
   }
 }

@@ -39,21 +39,39 @@ final class KeyframeWork {
 
   private final PhotoReader reader;
   private final Translator translator;
-  private final long extraOcrMillis;
+  private final AfterOcr afterOcr;
   // Lines read again at the next keyframe are mostly the same: translate each text once.
   private final Map<String, String> translated = new HashMap<>();
 
-  /** {@code extraOcrMillis}: a delay added to every OCR run, to test a slow OCR. */
-  KeyframeWork(PhotoReader reader, Translator translator, long extraOcrMillis) {
+  /** A test's hook after each OCR run of frame {@code frame}: a slow or a held-up OCR. */
+  interface AfterOcr {
+    void ran(int frame) throws InterruptedException;
+  }
+
+  KeyframeWork(PhotoReader reader, Translator translator, AfterOcr afterOcr) {
     this.reader = reader;
     this.translator = translator;
-    this.extraOcrMillis = extraOcrMillis;
+    this.afterOcr = afterOcr;
+  }
+
+  /** {@code extraOcrMillis}: a delay added to every OCR run, to try a slow OCR. */
+  static AfterOcr delay(long extraOcrMillis) {
+    return frame -> {
+      if (extraOcrMillis > 0) {
+        Thread.sleep(extraOcrMillis);
+      }
+    };
   }
 
   synchronized Result run(Mat rgb, int frame) throws HostException {
     long start = System.nanoTime();
     List<RecognizedLine> lines = reader.read(rgb);
-    pause(extraOcrMillis);
+    try {
+      afterOcr.ran(frame);
+    } catch (InterruptedException e) {
+      Thread.currentThread().interrupt();
+      throw new HostException(ExitStatus.INTERNAL, "interrupted while reading the text");
+    }
     long read = System.nanoTime();
 
     List<String> translations = translate(lines);
@@ -99,17 +117,5 @@ final class KeyframeWork {
 
   static String key(String text) {
     return text.strip().toLowerCase(Locale.ROOT);
-  }
-
-  private static void pause(long millis) throws HostException {
-    if (millis <= 0) {
-      return;
-    }
-    try {
-      Thread.sleep(millis);
-    } catch (InterruptedException e) {
-      Thread.currentThread().interrupt();
-      throw new HostException(ExitStatus.INTERNAL, "interrupted while reading the text");
-    }
   }
 }

@@ -5,9 +5,9 @@ import org.opencv.core.Mat;
 import org.opencv.core.RotatedRect;
 
 /**
- * A line drawn over the video: its text and translation, its id (the renderer caches its patch
- * and text object under it), where it is now, and the patch it is drawn with, with where and in
- * what light that patch was cut.
+ * A line drawn over the video: its text and translation, its id (the same line read again keeps
+ * it), where it is now, and the patch it is drawn with, with its own id and where and in what
+ * light it was cut.
  */
 final class ShownLine {
   final long id;
@@ -17,6 +17,11 @@ final class ShownLine {
   /** Where the line is in the current frame; null while the tracker has lost it. */
   RotatedRect rect;
   Mat patch;
+  /**
+   * The renderer uploads a patch only when its id changes, and caches the line's text object under
+   * it: every patch cut gets an id of its own.
+   */
+  long patchId = -1;
   int color;
   RotatedRect erasedAt;
   /** The frame's mean R, G, B under the patch when it was cut. */
@@ -30,11 +35,12 @@ final class ShownLine {
     this.rect = read.rect;
   }
 
-  void replacePatch(Mat newPatch, int newColor, RotatedRect at, double[] means) {
+  void replacePatch(Mat newPatch, long newPatchId, int newColor, RotatedRect at, double[] means) {
     if (patch != null) {
       patch.release();
     }
     patch = newPatch;
+    patchId = newPatchId;
     color = newColor;
     erasedAt = at;
     referenceMeans = means;

@@ -52,9 +52,11 @@ import org.opencv.imgproc.Imgproc;
  * through untouched.
  */
 public final class VideoJob {
-  // Frames queued for catching up while a live keyframe is worked on: 8 s at 30 fps. A result later
-  // than that is dropped and a new keyframe taken.
-  private static final int MAX_CATCH_UP_FRAMES = 240;
+  // The frames queued for catching up while a live keyframe is worked on are bounded by their
+  // size: 512 MiB is about 190 frames at 720p, 80 at 1080p, 20 at 4K. When the queue is full the
+  // keyframe is given up: its frames are freed, its result is dropped when it comes, and a new
+  // keyframe is taken on the frame after that.
+  private static final long MAX_CATCH_UP_BYTES = 512L << 20;
 
   /**
    * A live keyframe's result with its tracker, run through the frames queued meanwhile (taking
@@ -70,22 +72,70 @@ public final class VideoJob {
     }
   }
 
+  /**
+   * A live keyframe while the worker reads it: the result to come, why the keyframe was taken, and
+   * the frames that arrived since, which the new tracker catches up through. Given up when those
+   * frames outgrow their bound: they are freed, no more are queued, and the result is dropped when
+   * it comes.
+   */
+  private static final class LiveKeyframe {
+    final String reason;
+    final BlockingQueue<Mat> framesSince = new LinkedBlockingQueue<>();
+    Future<CaughtUp> result;
+    boolean givenUp;
+
+    LiveKeyframe(String reason) {
+      this.reason = reason;
+    }
+
+    void queue(Mat frame) {
+      if (!givenUp) {
+        framesSince.add(frame.clone());
+      }
+    }
+
+    void giveUpWhenOver(long frameBytes) {
+      if (framesSince.size() * frameBytes > MAX_CATCH_UP_BYTES) {
+        givenUp = true;
+        releaseFrames();
+      }
+    }
+
+    void releaseFrames() {
+      for (Mat frame = framesSince.poll(); frame != null; frame = framesSince.poll()) {
+        frame.release();
+      }
+    }
+  }
+
   private final KeyframeWork work;
   private final Language target;
   private final boolean live;
+  private final FrameClock clock;
 
-  /** {@code extraOcrMillis} delays every OCR run: a test hook for a slow OCR. */
+  /** {@code extraOcrMillis} delays every OCR run: a hook to try the loop with a slow OCR. */
   public VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
       long extraOcrMillis) {
-    this.work = new KeyframeWork(reader, translator, extraOcrMillis);
+    this(reader, translator, target, live, KeyframeWork.delay(extraOcrMillis), null);
+  }
+
+  /**
+   * Live with the frames arriving by {@code clock} (null: at the source's rate in real time), and
+   * {@code afterOcr} run after each OCR (tests hold the OCR up).
+   */
+  VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
+      KeyframeWork.AfterOcr afterOcr, FrameClock clock) {
+    this.work = new KeyframeWork(reader, translator, afterOcr);
     this.target = target;
     this.live = live;
+    this.clock = clock;
   }
 
   /** Runs the whole source through; {@code sink} receives every output frame. */
   public VideoResult run(FrameSource source, VideoSink sink, Progress progress)
       throws HostException {
-    Loop loop = new Loop(source, sink, progress);
+    Loop loop =
+        new Loop(source, sink, progress, clock != null ? clock : FrameClock.realTime(source.fps()));
     try {
       return loop.run();
     } finally {
@@ -103,12 +153,14 @@ public final class VideoJob {
     private final List<Map<String, Object>> keyframes = new ArrayList<>();
     private final List<Double> latencies = new ArrayList<>();
     private final ExecutorService worker;
+    private final FrameClock arrivals;
 
     private OverlayDrawer drawer;
     private long tracker;
     private Mat keyframeRgba;
     private List<ShownLine> shown = new ArrayList<>();
     private long nextId;
+    private long nextPatchId;
     private int lastKeyframe = Integer.MIN_VALUE;
     private boolean fontChosen;
     private List<Object> gainsKey;
@@ -116,15 +168,13 @@ public final class VideoJob {
     private final Mat rgbaFrame = new Mat();
     private Mat rgbaOf;
 
-    // Live: the keyframe being worked on, the reason it was taken, and the frames since.
-    private Future<CaughtUp> pending;
-    private String pendingReason;
-    private boolean pendingStale;
+    // Live: the keyframe the worker is reading, if any; set when one was given up.
+    private LiveKeyframe working;
     private boolean retakeKeyframe;
-    private BlockingQueue<Mat> catchUp = new LinkedBlockingQueue<>();
     private long startNanos;
 
-    Loop(FrameSource source, VideoSink sink, Progress progress) {
+    Loop(FrameSource source, VideoSink sink, Progress progress, FrameClock arrivals) {
+      this.arrivals = arrivals;
       this.source = source;
       this.sink = sink;
       this.progress = progress;
@@ -163,26 +213,13 @@ public final class VideoJob {
         drawer(frame); // as a phone starts its renderer with the surface, not at the first text
       }
       long start = System.nanoTime();
-      boolean lostAll = track(frame);
-      if (live) {
-        installFinishedWork(frame, k);
-      }
-      String reason = keyframeReason(frame, k, lostAll);
-      if (reason != null) {
-        takeKeyframe(frame, k, reason);
-      } else if (pending != null && !pendingStale) {
-        catchUp.add(frame.clone());
-      }
-      if (!live) {
-        eraseAgainWhereNeeded(frame);
-      }
-      Mat drawn = draw(frame, k);
+      Mat drawn = live ? liveStep(frame, k) : offlineStep(frame, k);
       double millis = (System.nanoTime() - start) / 1e6;
       timings.add("frame", millis);
       if (live && drawn != frame) {
         // What the keyframe worker costs the frame loop when both share the machine.
         timings.add(
-            pending != null ? "drawn frame, worker busy" : "drawn frame, worker idle", millis);
+            working != null ? "drawn frame, worker busy" : "drawn frame, worker idle", millis);
       }
       long encodeStart = System.nanoTime();
       sink.add(drawn);
@@ -190,6 +227,37 @@ public final class VideoJob {
         drawn.release();
       }
       timings.add("encode", (System.nanoTime() - encodeStart) / 1e6);
+    }
+
+    /**
+     * Offline, one frame in step order: track; read the frame again when the rules call for it
+     * (holding the frame up); erase again where patches went stale; draw.
+     */
+    private Mat offlineStep(Mat frame, int k) throws HostException {
+      boolean lostAll = track(frame);
+      String reason = keyframeReason(frame, k, lostAll);
+      if (reason != null) {
+        readKeyframe(frame, k, reason);
+      }
+      eraseAgainWhereNeeded(frame);
+      return draw(frame, k);
+    }
+
+    /**
+     * Live, one frame in step order, never waiting for the worker: track; take over a keyframe the
+     * worker has finished; start a keyframe when the rules call for it, or queue the frame for the
+     * one being read; draw.
+     */
+    private Mat liveStep(Mat frame, int k) throws HostException {
+      boolean lostAll = track(frame);
+      installFinishedWork(frame);
+      String reason = keyframeReason(frame, k, lostAll);
+      if (reason != null) {
+        startKeyframe(frame, k, reason);
+      } else if (working != null) {
+        working.queue(frame);
+      }
+      return draw(frame, k);
     }
 
     /** Step 1: moves the shown lines into this frame; true when the tracker lost all of them. */
@@ -216,7 +284,7 @@ public final class VideoJob {
 
     /** Step 2: why this frame must be read again, or null. */
     private String keyframeReason(Mat frame, int k, boolean lostAll) {
-      if (pending != null) {
+      if (working != null) {
         return null;
       }
       if (lastKeyframe == Integer.MIN_VALUE) {
@@ -262,24 +330,33 @@ public final class VideoJob {
       return rgbaFrame;
     }
 
-    private void takeKeyframe(Mat frame, int k, String reason) throws HostException {
+    /** Offline: reads the frame, translates and erases its lines, and tracks them from here. */
+    private void readKeyframe(Mat frame, int k, String reason) throws HostException {
       lastKeyframe = k;
-      if (!live) {
-        KeyframeWork.Result result = work.run(frame, k);
-        install(result, reason, frame, startTracker(frame, result), null);
-        return;
+      KeyframeWork.Result result = work.run(frame, k);
+      long newTracker;
+      try {
+        newTracker = startTracker(frame, result);
+      } catch (RuntimeException | Error e) {
+        result.patches().release();
+        throw e;
       }
+      install(result, reason, frame, newTracker, null);
+    }
+
+    /** Live: hands a copy of the frame to the worker; the frames after it are queued for it. */
+    private void startKeyframe(Mat frame, int k, String reason) {
+      lastKeyframe = k;
+      LiveKeyframe keyframe = new LiveKeyframe(reason);
       Mat copy = frame.clone();
-      BlockingQueue<Mat> queue = new LinkedBlockingQueue<>();
-      catchUp = queue;
-      pendingReason = reason;
-      pending = worker.submit(() -> {
+      keyframe.result = worker.submit(() -> {
         try {
-          return catchUpOnWorker(work.run(copy, k), copy, queue);
+          return catchUpOnWorker(work.run(copy, k), copy, keyframe.framesSince);
         } finally {
           copy.release();
         }
       });
+      working = keyframe;
     }
 
     /**
@@ -288,55 +365,77 @@ public final class VideoJob {
      */
     private CaughtUp catchUpOnWorker(
         KeyframeWork.Result result, Mat keyframe, BlockingQueue<Mat> queue) {
-      long tracker = startTracker(keyframe, result);
-      double[] rects = null;
-      long start = System.nanoTime();
-      for (Mat later = queue.poll(); later != null; later = queue.poll()) {
-        if (tracker != 0) {
-          rects = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+      long tracker = 0;
+      try {
+        tracker = startTracker(keyframe, result);
+        double[] rects = null;
+        long start = System.nanoTime();
+        for (Mat later = queue.poll(); later != null; later = queue.poll()) {
+          try {
+            if (tracker != 0) {
+              rects = TrackingJNI.updateTracker(tracker, later.getNativeObjAddr());
+            }
+          } finally {
+            later.release();
+          }
         }
-        later.release();
+        return new CaughtUp(result, tracker, rects, (System.nanoTime() - start) / 1e6);
+      } catch (RuntimeException | Error e) {
+        // Nobody will receive this result: free what it holds.
+        new CaughtUp(result, tracker, null, 0).release();
+        throw e;
       }
-      return new CaughtUp(result, tracker, rects, (System.nanoTime() - start) / 1e6);
     }
 
-    /** Live: takes a finished keyframe and brings its rectangles to this frame. */
-    private void installFinishedWork(Mat frame, int k) throws HostException {
-      if (pending == null) {
+    /** Live: takes a finished keyframe over and brings its rectangles to this frame. */
+    private void installFinishedWork(Mat frame) throws HostException {
+      if (working == null) {
         return;
       }
-      if (!pending.isDone()) {
-        if (catchUp.size() > MAX_CATCH_UP_FRAMES) {
-          // Too late to catch up with: stop queueing, drop its result when it comes.
-          pendingStale = true;
-          releaseCatchUp();
-        }
+      if (!working.result.isDone()) {
+        working.giveUpWhenOver(frame.total() * frame.elemSize());
         return;
       }
-      CaughtUp caughtUp = result(pending);
-      pending = null;
-      if (pendingStale) {
-        pendingStale = false;
+      LiveKeyframe done = working;
+      working = null;
+      CaughtUp caughtUp = result(done.result);
+      if (done.givenUp) {
         caughtUp.release();
-        releaseCatchUp();
+        done.releaseFrames();
         retakeKeyframe = true;
         return;
       }
       timings.add("catch-up on the worker", caughtUp.catchUpMillis());
       long start = System.nanoTime();
+      double[] rects;
+      try {
+        rects = catchUpHere(caughtUp, done.framesSince, frame);
+      } catch (RuntimeException | Error e) {
+        caughtUp.release();
+        done.releaseFrames();
+        throw e;
+      }
+      timings.add("catch-up", (System.nanoTime() - start) / 1e6);
+      install(caughtUp.result(), done.reason, frame, caughtUp.tracker(), rects);
+      latencies.add(arrivals.millisSince(caughtUp.result().frame()));
+    }
+
+    /** Runs a caught-up tracker through the frames queued after the worker's last, then frame. */
+    private double[] catchUpHere(CaughtUp caughtUp, BlockingQueue<Mat> queued, Mat frame) {
       double[] rects = caughtUp.rects();
-      for (Mat later = catchUp.poll(); later != null; later = catchUp.poll()) {
-        if (caughtUp.tracker() != 0) {
-          rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
+      for (Mat later = queued.poll(); later != null; later = queued.poll()) {
+        try {
+          if (caughtUp.tracker() != 0) {
+            rects = TrackingJNI.updateTracker(caughtUp.tracker(), later.getNativeObjAddr());
+          }
+        } finally {
+          later.release();
         }
-        later.release();
       }
       if (caughtUp.tracker() != 0) {
         rects = TrackingJNI.updateTracker(caughtUp.tracker(), frame.getNativeObjAddr());
       }
-      timings.add("catch-up", (System.nanoTime() - start) / 1e6);
-      install(caughtUp.result(), pendingReason, frame, caughtUp.tracker(), rects);
-      latencies.add((System.nanoTime() - arrivalNanos(caughtUp.result().frame())) / 1e6);
+      return rects;
     }
 
     /**
@@ -358,8 +457,9 @@ public final class VideoJob {
           continue;
         }
         ShownLine shownLine = new ShownLine(idFor(line), result.frame(), line, translation);
-        shownLine.replacePatch(result.patches().overlays.get(p), result.patches().colors[p],
-            line.rect, Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
+        shownLine.replacePatch(result.patches().overlays.get(p), nextPatchId++,
+            result.patches().colors[p], line.rect,
+            Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
         next.add(shownLine);
         ++p;
       }
@@ -469,8 +569,8 @@ public final class VideoJob {
       Eraser.Patches patches = Eraser.erase(frame, rects);
       double[] means = FrameMeans.under(frame, patches.patchRects);
       for (int i = 0; i < stale.size(); i++) {
-        stale.get(i).replacePatch(patches.overlays.get(i), patches.colors[i], rects.get(i),
-            Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
+        stale.get(i).replacePatch(patches.overlays.get(i), nextPatchId++, patches.colors[i],
+            rects.get(i), Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
       }
       timings.add("erase again", (System.nanoTime() - start) / 1e6);
     }
@@ -497,7 +597,7 @@ public final class VideoJob {
       for (int i = 0; i < n; i++) {
         ShownLine line = visible.get(i);
         texts[i] = line.translation;
-        ids[i] = line.id;
+        ids[i] = line.patchId;
         patches[i] = line.patch.getNativeObjAddr();
         colors[i] = line.color;
         textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));
@@ -551,25 +651,11 @@ public final class VideoJob {
     }
 
     private void waitForArrival(int k) throws HostException {
-      long wait = arrivalNanos(k) - System.nanoTime();
-      if (wait <= 0) {
-        return;
-      }
       try {
-        Thread.sleep(wait / 1_000_000, (int) (wait % 1_000_000));
+        arrivals.awaitFrame(k);
       } catch (InterruptedException e) {
         Thread.currentThread().interrupt();
         throw new HostException(ExitStatus.INTERNAL, "interrupted");
-      }
-    }
-
-    private long arrivalNanos(int k) {
-      return startNanos + (long) (k * 1e9 / source.fps());
-    }
-
-    private void releaseCatchUp() {
-      for (Mat frame = catchUp.poll(); frame != null; frame = catchUp.poll()) {
-        frame.release();
       }
     }
 
@@ -581,14 +667,16 @@ public final class VideoJob {
       if (worker != null) {
         worker.shutdownNow();
         try {
-          if (pending != null) {
-            pending.get().release();
+          if (working != null) {
+            working.result.get().release();
           }
         } catch (InterruptedException | ExecutionException | RuntimeException e) {
           // The worker failed or was stopped; it holds nothing more to free.
         }
       }
-      releaseCatchUp();
+      if (working != null) {
+        working.releaseFrames();
+      }
       releaseShown();
       if (tracker != 0) {
         TrackingJNI.releaseTracker(tracker);

@@ -19,6 +19,7 @@ import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
 import java.util.ArrayList;
+import java.util.Arrays;
 import java.util.HashSet;
 import java.util.List;
 import java.util.Locale;
@@ -30,6 +31,9 @@ import org.junit.jupiter.api.Test;
 import org.junit.jupiter.api.io.TempDir;
 import org.opencv.core.Core;
 import org.opencv.core.Mat;
+import org.opencv.core.Point;
+import org.opencv.core.RotatedRect;
+import org.opencv.core.Size;
 import org.opencv.imgcodecs.Imgcodecs;
 import org.opencv.imgproc.Imgproc;
 
@@ -81,6 +85,23 @@ class PhotoTranslateTest {
     translations.forEach(t -> spanish.addAll(split(t)));
     assertTrue(share(english, englishLeft) <= 0.10, "English left: " + englishLeft);
     assertTrue(share(spanish, spanishRead) >= 0.60, "Spanish read: " + spanishRead);
+    // And where it stood: a Spanish line read within line i's rectangle reads as translation i.
+    List<RotatedRect> rects = rects(json);
+    List<RecognizedLine> spanishLines = new PhotoReader("spa").read(translated);
+    List<String> misplaced = new ArrayList<>();
+    for (int i = 0; i < translations.size(); i++) {
+      List<String> expected = split(translations.get(i));
+      boolean found = false;
+      for (RecognizedLine line : spanishLines) {
+        found |= inside(line.rect.center, rects.get(i))
+            && share(expected, new HashSet<>(split(line.text))) >= 0.5;
+      }
+      if (!found) {
+        misplaced.add(translations.get(i));
+      }
+    }
+    assertTrue(misplaced.size() <= 0.4 * translations.size(),
+        "not read where their English stood: " + misplaced);
 
     Mat sheet = read(out.resolve("street.compare.png"));
     assertEquals(2 * translated.cols() + 8, sheet.cols());
@@ -129,6 +150,26 @@ class PhotoTranslateTest {
       values.add(m.group(1));
     }
     return values;
+  }
+
+  private static List<RotatedRect> rects(String json) {
+    List<RotatedRect> rects = new ArrayList<>();
+    Matcher m = Pattern.compile("\"rect\": \\[([^\\]]*)\\]").matcher(json);
+    while (m.find()) {
+      double[] v = Arrays.stream(m.group(1).split(",")).mapToDouble(Double::parseDouble).toArray();
+      rects.add(new RotatedRect(new Point(v[0], v[1]), new Size(v[2], v[3]), v[4]));
+    }
+    return rects;
+  }
+
+  /** Whether {@code p} lies in {@code rect}, with half a line height to spare above and below. */
+  private static boolean inside(Point p, RotatedRect rect) {
+    double a = Math.toRadians(rect.angle);
+    double dx = p.x - rect.center.x;
+    double dy = p.y - rect.center.y;
+    double along = dx * Math.cos(a) + dy * Math.sin(a);
+    double across = -dx * Math.sin(a) + dy * Math.cos(a);
+    return Math.abs(along) <= rect.size.width / 2 && Math.abs(across) <= rect.size.height;
   }
 
   private static List<String> split(String text) {
