@@ -71,6 +71,14 @@ struct TextLine {
   std::vector<CharacterBox> characters;  // only with ReaderOptions::character_boxes
 };
 
+// Where the time of one Read went, for measuring.
+struct ReadTimings {
+  double detection_ms = 0.0;       // the detector and its boxes
+  double classification_ms = 0.0;  // upright crops and the 0/180 classifier
+  double recognition_ms = 0.0;     // the recogniser, decoding and grouping
+  int boxes = 0;                   // boxes the detector found
+};
+
 class TextReader {
  public:
   // Loads the detector, classifier and the script's recogniser from
@@ -86,6 +94,8 @@ class TextReader {
   // image or another type; an image with no text gives no lines. Safe to call
   // from one thread at a time.
   std::vector<TextLine> Read(const cv::Mat& image) const;
+  // The same, telling where the time went.
+  std::vector<TextLine> Read(const cv::Mat& image, ReadTimings* timings) const;
 
  private:
   struct Models;
