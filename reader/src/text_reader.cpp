@@ -29,6 +29,9 @@ void CheckOptions(const ReaderOptions& options) {
   if (options.threads < 0 || options.threads > kMaxThreads)
     throw std::invalid_argument("text reader: threads must be in 0..256, not " +
                                 std::to_string(options.threads));
+  if (options.recognition_min_width < 8 || options.recognition_min_width > kMaxCropWidth)
+    throw std::invalid_argument("text reader: recognition_min_width must be in 8..4096, not " +
+                                std::to_string(options.recognition_min_width));
   if (!(options.min_confidence >= 0.0F && options.min_confidence <= 1.0F) ||
       !(options.box_threshold >= 0.0F && options.box_threshold <= 1.0F))
     throw std::invalid_argument("text reader: min_confidence and box_threshold must be in 0..1");
@@ -76,7 +79,7 @@ struct TextReader::Models {
                    o.script == Script::kLatin
                        ? EnglishAlphabet()
                        : LoadDictionaryAlphabet(ModelPath(o, "ppocr_keys_v1.txt")),
-                   o.threads) {}
+                   o.threads, o.recognition_min_width) {}
 };
 
 TextReader::TextReader(const ReaderOptions& options) : options_(options) {

@@ -56,6 +56,10 @@ struct ReaderOptions {
   // A detected box is kept when the detector's mean text probability inside
   // it reaches this (0..1).
   float box_threshold = 0.6F;
+  // The recogniser reads each line padded to at least this width (pixels at
+  // 48 high). Its cost grows with the width: a short word padded to 320
+  // costs as much as a long line.
+  int recognition_min_width = 320;
 };
 
 struct CharacterBox {
