@@ -5,8 +5,9 @@
 namespace textreader {
 
 Normalisation DetectorNormalisation() {
-  // B, G, R of the ImageNet means and deviations.
-  return {{0.406F, 0.456F, 0.485F}, {0.225F, 0.224F, 0.229F}};
+  // The ImageNet statistics in the order the detector was trained with them:
+  // listed R, G, B but applied to the B, G, R planes as they stand.
+  return {{0.485F, 0.456F, 0.406F}, {0.229F, 0.224F, 0.225F}};
 }
 
 Normalisation LineNormalisation() {

