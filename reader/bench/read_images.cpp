@@ -1,7 +1,7 @@
 // Reads image files with the text reader and prints, per file, one JSON line:
 // the file, the time taken and the lines read. For looking at what the reader
 // reads and for scripts/textreader/quality.py, which scores it.
-//   read_images [--long-side N] [--script latin|chinese] [--threads N]
+//   read_images [--long-side N] [--scene-long-side N] [--script latin|chinese] [--threads N]
 //               [--min-confidence F] [--box-threshold F] [--min-width N]
 //               [--models DIR] FILE...
 #include <chrono>
@@ -55,6 +55,8 @@ int main(int argc, char** argv) {
       options.min_confidence = std::strtof(argv[++i], nullptr);
     else if (arg == "--box-threshold" && has_value)
       options.box_threshold = std::strtof(argv[++i], nullptr);
+    else if (arg == "--scene-long-side" && has_value)
+      options.scene_long_side = std::atoi(argv[++i]);
     else if (arg == "--min-width" && has_value)
       options.recognition_min_width = std::atoi(argv[++i]);
     else if (arg == "--models" && has_value)

@@ -88,7 +88,7 @@ void Measure(const char* name, const cv::Mat& frame, int threads, int runs, int 
 
 int main(int argc, char** argv) {
   const std::string data = std::string(TEXTREADER_SHARED_DATA);
-  const std::string street = argc > 2 ? argv[1] : data + "/ic15ch4test_img_480.jpg";
+  const std::string street = argc > 2 ? argv[1] : data + "/ic15ch4test_img_10.jpg";
   const std::string page = argc > 2 ? argv[2] : data + "/sroie_072.jpg";
   const int runs = argc > 3 ? std::max(1, std::atoi(argv[3])) : 10;
   const int min_width = argc > 4 ? std::atoi(argv[4]) : 320;

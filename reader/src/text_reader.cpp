@@ -21,11 +21,17 @@ namespace {
 constexpr int kMinLongSide = 32;
 constexpr int kMaxLongSide = 4096;
 constexpr int kMaxThreads = 256;
+// Fewer boxes than this make a scene rather than a page.
+constexpr std::size_t kPageBoxes = 30;
 
 void CheckOptions(const ReaderOptions& options) {
   if (options.detection_long_side < kMinLongSide || options.detection_long_side > kMaxLongSide)
     throw std::invalid_argument("text reader: detection_long_side must be in 32..4096, not " +
                                 std::to_string(options.detection_long_side));
+  if (options.scene_long_side != 0 &&
+      (options.scene_long_side < kMinLongSide || options.scene_long_side > kMaxLongSide))
+    throw std::invalid_argument("text reader: scene_long_side must be 0 or in 32..4096, not " +
+                                std::to_string(options.scene_long_side));
   if (options.threads < 0 || options.threads > kMaxThreads)
     throw std::invalid_argument("text reader: threads must be in 0..256, not " +
                                 std::to_string(options.threads));
@@ -100,8 +106,12 @@ std::vector<TextLine> TextReader::Read(const cv::Mat& image, ReadTimings* timing
   // 1. Where the text is: boxes from the detector's probability map.
   DbParameters db;
   db.box_threshold = options_.box_threshold;
-  const std::vector<cv::RotatedRect> boxes = BoxesFromMap(
-      models_->detector.ProbabilityMap(image, options_.detection_long_side), db, image.size());
+  const auto detect = [&](int long_side) {
+    return BoxesFromMap(models_->detector.ProbabilityMap(image, long_side), db, image.size());
+  };
+  std::vector<cv::RotatedRect> boxes = detect(options_.detection_long_side);
+  if (options_.scene_long_side > 0 && boxes.size() < kPageBoxes)
+    boxes = detect(options_.scene_long_side);
   const double detection_ms = stopwatch.Lap();
 
   // 2. Each box upright, as its text reads, and at the recogniser's height.

@@ -59,6 +59,12 @@ TEST(BadInput, OptionsOutOfRangeAreRefused) {
     EXPECT_THROW(TextReader{options}, std::invalid_argument) << side;
   }
   ReaderOptions options = Options();
+  options.scene_long_side = 20;
+  EXPECT_THROW(TextReader{options}, std::invalid_argument);
+  options = Options();
+  options.recognition_min_width = 5000;
+  EXPECT_THROW(TextReader{options}, std::invalid_argument);
+  options = Options();
   options.threads = -1;
   EXPECT_THROW(TextReader{options}, std::invalid_argument);
   options = Options();

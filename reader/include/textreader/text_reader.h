@@ -43,6 +43,11 @@ struct ReaderOptions {
   Script script = Script::kLatin;
   // The detector sees the image scaled so that its long side is this.
   int detection_long_side = 960;
+  // When the detector finds few boxes at detection_long_side (a scene, not a
+  // page of dozens of lines), it looks again at this long side, which finds
+  // more of a scene's small text; 0 never does. Pages stay at the first side,
+  // where fewer neighbouring words run together.
+  int scene_long_side = 0;
   // ONNX Runtime intra-op threads per session.
   int threads = 1;
   // Recognise the lines; when false, lines come with empty text and
