@@ -28,7 +28,7 @@ class Recogniser {
  public:
   // Throws ModelError when the model's classes do not match `alphabet`.
   // Lines are padded to at least `min_width`.
-  Recogniser(const std::string& path, Alphabet alphabet, int threads, int min_width = 320);
+  Recogniser(const std::string& path, Alphabet alphabet, int threads, int min_width);
 
   // Reads crops `kRecogniserHeight` pixels high (8-bit R G B (A)), batched by
   // width; one reading per crop, in order.

@@ -1,5 +1,6 @@
 #include "textreader/text_reader.h"
 
+#include <algorithm>
 #include <chrono>
 #include <stdexcept>
 
@@ -21,7 +22,7 @@ namespace {
 constexpr int kMinLongSide = 32;
 constexpr int kMaxLongSide = 4096;
 constexpr int kMaxThreads = 256;
-// Fewer boxes than this make a scene rather than a page.
+// So many boxes make a page rather than a scene.
 constexpr std::size_t kPageBoxes = 30;
 
 void CheckOptions(const ReaderOptions& options) {
@@ -109,9 +110,16 @@ std::vector<TextLine> TextReader::Read(const cv::Mat& image, ReadTimings* timing
   const auto detect = [&](int long_side) {
     return BoxesFromMap(models_->detector.ProbabilityMap(image, long_side), db, image.size());
   };
-  std::vector<cv::RotatedRect> boxes = detect(options_.detection_long_side);
-  if (options_.scene_long_side > 0 && boxes.size() < kPageBoxes)
-    boxes = detect(options_.scene_long_side);
+  // The scene's side only where it keeps detail that the page's side would
+  // lose: never larger than the image (upscaling splits words).
+  const int scene_side =
+      std::min(options_.scene_long_side,
+               std::max(options_.detection_long_side, std::max(image.cols, image.rows)));
+  const bool scene_first = scene_side > options_.detection_long_side;
+  std::vector<cv::RotatedRect> boxes =
+      detect(scene_first ? scene_side : options_.detection_long_side);
+  if (scene_first && boxes.size() >= kPageBoxes)
+    boxes = detect(options_.detection_long_side);
   const double detection_ms = stopwatch.Lap();
 
   // 2. Each box upright, as its text reads, and at the recogniser's height.

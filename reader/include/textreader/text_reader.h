@@ -43,11 +43,12 @@ struct ReaderOptions {
   Script script = Script::kLatin;
   // The detector sees the image scaled so that its long side is this.
   int detection_long_side = 960;
-  // When the detector finds few boxes at detection_long_side (a scene, not a
-  // page of dozens of lines), it looks again at this long side, which finds
-  // more of a scene's small text; 0 never does. Pages stay at the first side,
-  // where fewer neighbouring words run together.
-  int scene_long_side = 0;
+  // The detector looks first at this long side (or the image's own, if
+  // smaller), which finds more of a scene's small text; when that gives a
+  // page (dozens of boxes), it looks again at detection_long_side, where
+  // fewer of a page's neighbouring words run together. 0, or a side not
+  // above detection_long_side: detection_long_side alone.
+  int scene_long_side = 1280;
   // ONNX Runtime intra-op threads per session.
   int threads = 1;
   // Recognise the lines; when false, lines come with empty text and
@@ -62,9 +63,9 @@ struct ReaderOptions {
   // it reaches this (0..1).
   float box_threshold = 0.6F;
   // The recogniser reads each line padded to at least this width (pixels at
-  // 48 high). Its cost grows with the width: a short word padded to 320
-  // costs as much as a long line.
-  int recognition_min_width = 320;
+  // 48 high). Its cost grows with the width; less padding after a short word
+  // also gives it fewer blank steps to read stray marks into.
+  int recognition_min_width = 160;
 };
 
 struct CharacterBox {
