@@ -1,7 +1,7 @@
 // Measures the text reader per stage at 1280 x 720: a street photograph and
 // a printed page (real images, scaled to fit and padded), with one intra-op
 // thread and with the runtime's default; model loading once; peak memory.
-//   reader_stages [street.jpg page.jpg [runs [recognition_min_width]]]
+//   reader_stages [street.jpg page.jpg [runs [recognition_min_width [scene_long_side]]]]
 #include <sys/resource.h>
 #include <time.h>
 
@@ -50,11 +50,13 @@ cv::Mat At720p(const std::string& path) {
   return frame;
 }
 
-void Measure(const char* name, const cv::Mat& frame, int threads, int runs, int min_width) {
+void Measure(const char* name, const cv::Mat& frame, int threads, int runs, int min_width,
+             int scene_side) {
   textreader::ReaderOptions options;
   options.model_dir = TEXTREADER_MODEL_DIR;
   options.threads = threads;
   options.recognition_min_width = min_width;
+  options.scene_long_side = scene_side;
   const auto load_start = Clock::now();
   const textreader::TextReader reader(options);
   const double load_ms =
@@ -91,12 +93,13 @@ int main(int argc, char** argv) {
   const std::string street = argc > 2 ? argv[1] : data + "/ic15ch4test_img_10.jpg";
   const std::string page = argc > 2 ? argv[2] : data + "/sroie_072.jpg";
   const int runs = argc > 3 ? std::max(1, std::atoi(argv[3])) : 10;
-  const int min_width = argc > 4 ? std::atoi(argv[4]) : 320;
+  const int min_width = argc > 4 ? std::atoi(argv[4]) : 160;
+  const int scene_side = argc > 5 ? std::atoi(argv[5]) : 1280;
   const cv::Mat street_frame = At720p(street);
   const cv::Mat page_frame = At720p(page);
   for (const int threads : {1, 0}) {
-    Measure("street", street_frame, threads, runs, min_width);
-    Measure("page", page_frame, threads, runs, min_width);
+    Measure("street", street_frame, threads, runs, min_width, scene_side);
+    Measure("page", page_frame, threads, runs, min_width, scene_side);
   }
   rusage usage{};
   getrusage(RUSAGE_SELF, &usage);
