@@ -33,7 +33,7 @@ integrity() { echo "sha512-$(sha512sum "$1" | cut -d' ' -f1 | tr a-f A-F | basen
 # Fetches name@version into $work/<name>.tgz and checks it against the lock.
 fetch() {
   local name=$1 version=$2 expected=$3 file
-  if ! file=$(cd "$work" && npm pack --silent --ignore-scripts "$name@$version" 2>"$work/npm.log"); then
+  if ! file=$(cd "$work" && npm pack --loglevel=error --ignore-scripts "$name@$version" 2>"$work/npm.log"); then
     echo "setup: cannot fetch $name@$version from the npm registry (is it reachable?):" >&2
     sed 's/^/  /' "$work/npm.log" >&2
     exit 1
