@@ -143,7 +143,7 @@ TEST(TextReader, ReadsAPhotographTurnedUpsideDown) {
   }
 }
 
-TEST(TextReader, ChineseRecogniserReadsChineseAndLatin) {
+TEST(TextReader, ChineseRecogniserReadsLatinTooWithoutItsSpaces) {
   // OpenCV draws no Chinese glyphs: Latin through the Chinese model, which
   // reads it with its own dictionary (and without spaces between words).
   const cv::Mat image = RenderedText("HOTEL 88", {400, 200}, {200, 100}, 1.6, 0);
