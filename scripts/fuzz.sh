@@ -15,7 +15,7 @@ seconds="${1:-}"
 
 CC=clang CXX=clang++ cmake -S . -B build-fuzz -DCMAKE_BUILD_TYPE=RelWithDebInfo -DOCR_FUZZ=ON \
   >/dev/null
-read -r -a targets <<<"${FUZZ_TARGETS:-frame_mapping tracker color_statistics text_layout inpainting_request}"
+read -r -a targets <<<"${FUZZ_TARGETS:-frame_mapping tracker color_statistics text_layout inpainting_request text_reader}"
 nice -n 10 cmake --build build-fuzz -j "$(nproc)" --target "${targets[@]/%/_fuzzer}"
 
 # Longest input per target: enough bytes for every decision the target reads

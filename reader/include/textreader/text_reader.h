@@ -43,6 +43,12 @@ struct ReaderOptions {
   Script script = Script::kLatin;
   // The detector sees the image scaled so that its long side is this.
   int detection_long_side = 960;
+  // The detector looks first at this long side (or the image's own, if
+  // smaller), which finds more of a scene's small text; when that gives a
+  // page (dozens of boxes), it looks again at detection_long_side, where
+  // fewer of a page's neighbouring words run together. 0, or a side not
+  // above detection_long_side: detection_long_side alone.
+  int scene_long_side = 1280;
   // ONNX Runtime intra-op threads per session.
   int threads = 1;
   // Recognise the lines; when false, lines come with empty text and
@@ -51,6 +57,15 @@ struct ReaderOptions {
   bool recognise = true;
   // Report a box per character (from the CTC steps' positions).
   bool character_boxes = false;
+  // Lines read with a lower confidence (0..1) are dropped as misreadings.
+  float min_confidence = 0.5F;
+  // A detected box is kept when the detector's mean text probability inside
+  // it reaches this (0..1).
+  float box_threshold = 0.6F;
+  // The recogniser reads each line padded to at least this width (pixels at
+  // 48 high). Its cost grows with the width; less padding after a short word
+  // also gives it fewer blank steps to read stray marks into.
+  int recognition_min_width = 160;
 };
 
 struct CharacterBox {
@@ -61,9 +76,17 @@ struct CharacterBox {
 struct TextLine {
   cv::RotatedRect rect;
   std::array<cv::Point2f, 4> corners;
-  std::string text;  // UTF-8
-  float confidence = 0.0F;  // 0..1
+  std::string text;                      // UTF-8
+  float confidence = 0.0F;               // 0..1
   std::vector<CharacterBox> characters;  // only with ReaderOptions::character_boxes
+};
+
+// Where the time of one Read went, for measuring.
+struct ReadTimings {
+  double detection_ms = 0.0;       // the detector and its boxes
+  double classification_ms = 0.0;  // upright crops and the 0/180 classifier
+  double recognition_ms = 0.0;     // the recogniser, decoding and grouping
+  int boxes = 0;                   // boxes the detector found
 };
 
 class TextReader {
@@ -81,6 +104,8 @@ class TextReader {
   // image or another type; an image with no text gives no lines. Safe to call
   // from one thread at a time.
   std::vector<TextLine> Read(const cv::Mat& image) const;
+  // The same, telling where the time went.
+  std::vector<TextLine> Read(const cv::Mat& image, ReadTimings* timings) const;
 
  private:
   struct Models;
