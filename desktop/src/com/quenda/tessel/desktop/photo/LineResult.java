@@ -32,6 +32,7 @@ public final class LineResult {
             line.rect.size.height, line.rect.angle});
     json.put("color", translated() ? hex(color) : null);
     json.put("confidence", Math.round(line.confidence));
+    json.put("reader", line.reader);
     return json;
   }
 

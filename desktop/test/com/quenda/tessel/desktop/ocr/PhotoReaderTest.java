@@ -8,15 +8,9 @@ import static org.junit.jupiter.api.Assertions.assertTrue;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.scenes.Backdrop;
-import com.quenda.tessel.desktop.scenes.Fonts;
 import com.quenda.tessel.desktop.scenes.Scene;
 import com.quenda.tessel.desktop.scenes.Scenes;
 import com.quenda.tessel.desktop.scenes.SignScene;
-import java.awt.Color;
-import java.awt.Graphics2D;
-import java.awt.RenderingHints;
-import java.awt.image.BufferedImage;
-import java.awt.image.DataBufferByte;
 import java.io.IOException;
 import java.nio.file.Files;
 import java.nio.file.Path;
@@ -27,7 +21,6 @@ import org.junit.jupiter.api.io.TempDir;
 import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
-import org.opencv.imgproc.Imgproc;
 
 /** The reader against generated scenes whose text and rectangles are known, with real OCR. */
 class PhotoReaderTest {
@@ -62,26 +55,80 @@ class PhotoReaderTest {
   }
 
   @Test
-  void keepsALineWithWideWordSpacesBetweenShortLettersWhole() throws HostException {
-    // Sharp, as a screenshot: between "the" and "counter" the space is wider than 0.9 of the
-    // x-height, which used to cut the line in two.
-    BufferedImage picture = new BufferedImage(900, 200, BufferedImage.TYPE_3BYTE_BGR);
-    Graphics2D g = picture.createGraphics();
-    g.setColor(Color.WHITE);
-    g.fillRect(0, 0, 900, 200);
-    g.setColor(Color.DARK_GRAY);
-    g.setRenderingHint(
-        RenderingHints.KEY_TEXT_ANTIALIASING, RenderingHints.VALUE_TEXT_ANTIALIAS_ON);
-    g.setFont(Fonts.SANS.deriveFont(40f));
-    g.drawString("Tickets are sold at the counter", 60, 110);
-    g.dispose();
-    Mat rgb = new Mat(200, 900, CvType.CV_8UC3);
-    rgb.put(0, 0, ((DataBufferByte) picture.getRaster().getDataBuffer()).getData());
-    Imgproc.cvtColor(rgb, rgb, Imgproc.COLOR_BGR2RGB);
+  void readsLinesWithTheLearnedRecogniserAndSaysSo() throws HostException {
+    Mat rgb = TextPictures.lines(900, 260, "Tickets are sold at the counter", "Platform 4");
     List<RecognizedLine> lines = reader.read(rgb);
-    assertEquals(1, lines.size(), "lines: " + lines);
+    assertEquals(2, lines.size(), "lines: " + lines);
     assertEquals("Tickets are sold at the counter", lines.get(0).text);
+    assertEquals("Platform 4", lines.get(1).text);
+    assertEquals(PhotoReader.LATIN, lines.get(0).reader);
+    assertTrue(lines.get(0).confidence > 80 && lines.get(0).confidence <= 100, lines.toString());
+
+    // Upside down: the same text, the angle saying which way it runs, in the same places.
+    Mat turned = TextPictures.upsideDown(rgb);
+    List<RecognizedLine> back = reader.read(turned);
+    assertEquals(2, back.size(), "lines: " + back);
+    for (RecognizedLine line : back) {
+      assertEquals(180, Math.abs(line.rect.angle), 3, line.toString());
+    }
+    // Reading order is the page's as it lies: the turned "Platform 4" is now on top.
+    assertEquals("Platform 4", back.get(0).text);
+    assertEquals("Tickets are sold at the counter", back.get(1).text);
+    assertEquals(rgb.cols() - lines.get(0).rect.center.x, back.get(1).rect.center.x, 4);
+    assertEquals(rgb.rows() - lines.get(0).rect.center.y, back.get(1).rect.center.y, 4);
     rgb.release();
+    turned.release();
+  }
+
+  @Test
+  void accentedLettersAreReadByTesseractOnTheDetectedLines() throws HostException {
+    Mat rgb = TextPictures.lines(
+        1000, 340, "Atención: suelo mojado", "Salida de emergencia", "Señal de tráfico");
+    try (PhotoReader spanish = new PhotoReader("spa")) {
+      assertEquals(PhotoReader.TESSERACT, spanish.recogniser());
+      List<RecognizedLine> lines = spanish.read(rgb);
+      assertEquals(List.of("Atención: suelo mojado", "Salida de emergencia", "Señal de tráfico"),
+          lines.stream().map(l -> l.text).toList());
+      for (RecognizedLine line : lines) {
+        assertEquals(PhotoReader.TESSERACT, line.reader);
+      }
+      // Upside down as well: the detector's direction reaches the crops.
+      Mat turned = TextPictures.upsideDown(rgb);
+      assertEquals(List.of("Señal de tráfico", "Salida de emergencia", "Atención: suelo mojado"),
+          spanish.read(turned).stream().map(l -> l.text).toList());
+      turned.release();
+    }
+    // The English recogniser has no accents: what it reads drops them.
+    assertTrue(!reader.read(rgb).get(0).text.contains("ó"));
+    rgb.release();
+  }
+
+  @Test
+  void lightLettersOnADarkGroundAreTurnedDarkOnLightForTesseract() {
+    Mat rgb = TextPictures.lines(400, 120, "Exit");
+    Mat dark = new Mat();
+    Core.bitwise_not(rgb, dark);
+    Mat crop = PhotoReader.darkOnLight(dark);
+    // The ground (the crop's margin) is white again, the letters dark.
+    assertEquals(255, crop.get(0, 0)[0], 1);
+    assertEquals(0, Core.minMaxLoc(crop).minVal, 80);
+    assertEquals(rgb.rows() + 2 * PhotoReader.CROP_MARGIN, crop.rows());
+    Mat same = PhotoReader.darkOnLight(rgb.clone());
+    assertEquals(255, same.get(0, 0)[0], 1);
+    rgb.release();
+    crop.release();
+    same.release();
+  }
+
+  @Test
+  void symbolsAloneAreNotText() {
+    assertTrue(PhotoReader.looksLikeText("Exit"));
+    assertTrue(PhotoReader.looksLikeText("RM13.58"));
+    assertTrue(PhotoReader.looksLikeText("出口"));
+    assertTrue(!PhotoReader.looksLikeText("|"));
+    assertTrue(!PhotoReader.looksLikeText("a"));
+    assertTrue(!PhotoReader.looksLikeText("-:|-"));
+    assertTrue(!PhotoReader.looksLikeText("x--|"));
   }
 
   @Test
@@ -121,7 +168,7 @@ class PhotoReaderTest {
     assertEquals("tesseract-ocr-chi-sim", PhotoReader.debianPackage("chi_sim"));
 
     HostException noProgram = assertThrows(
-        HostException.class, () -> new PhotoReader("eng", "/nonexistent/tesseract", 5000));
+        HostException.class, () -> new PhotoReader("spa", null, "/nonexistent/tesseract", 5000));
     assertEquals(ExitStatus.MISSING_OCR_DATA, noProgram.status);
     assertTrue(noProgram.getMessage().endsWith("install the Debian package tesseract-ocr"),
         noProgram.getMessage());
@@ -132,9 +179,9 @@ class PhotoReaderTest {
       throws IOException, HostException {
     Path fake = dir.resolve("tesseract");
     Files.writeString(fake,
-        "#!/bin/sh\nif [ \"$1\" = --list-langs ]; then echo eng; exit 0; fi\nexec sleep 60\n");
+        "#!/bin/sh\nif [ \"$1\" = --list-langs ]; then echo spa; exit 0; fi\nexec sleep 60\n");
     assertTrue(fake.toFile().setExecutable(true));
-    PhotoReader hanging = new PhotoReader("eng", fake.toString(), 1000);
+    PhotoReader hanging = new PhotoReader("spa", null, fake.toString(), 1000);
     Scene street = Scenes.bundled("street");
     long start = System.nanoTime();
     HostException timeout = assertThrows(HostException.class, () -> hanging.read(street.rgb));
