@@ -1,6 +1,6 @@
 # Fails when a C++ or Java source under the tracked directories differs from
 # what clang-format makes of it with the repository's .clang-format.
-set(dirs platform src vexel tests bench java desktop fuzz)
+set(dirs platform src vexel tests bench java desktop fuzz reader)
 set(files)
 foreach(dir ${dirs})
   file(GLOB_RECURSE found ${SOURCE_DIR}/${dir}/*.cpp ${SOURCE_DIR}/${dir}/*.h

@@ -51,6 +51,11 @@ struct ReaderOptions {
   bool recognise = true;
   // Report a box per character (from the CTC steps' positions).
   bool character_boxes = false;
+  // Lines read with a lower confidence (0..1) are dropped as misreadings.
+  float min_confidence = 0.5F;
+  // A detected box is kept when the detector's mean text probability inside
+  // it reaches this (0..1).
+  float box_threshold = 0.6F;
 };
 
 struct CharacterBox {
@@ -61,8 +66,8 @@ struct CharacterBox {
 struct TextLine {
   cv::RotatedRect rect;
   std::array<cv::Point2f, 4> corners;
-  std::string text;  // UTF-8
-  float confidence = 0.0F;  // 0..1
+  std::string text;                      // UTF-8
+  float confidence = 0.0F;               // 0..1
   std::vector<CharacterBox> characters;  // only with ReaderOptions::character_boxes
 };
 

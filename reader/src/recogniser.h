@@ -1,0 +1,46 @@
+// The CTC line recogniser: upright crops in, text out.
+#ifndef TEXTREADER_RECOGNISER_H_
+#define TEXTREADER_RECOGNISER_H_
+
+#include <string>
+#include <vector>
+
+#include <opencv2/core.hpp>
+
+#include "alphabet.h"
+#include "ctc_decoder.h"
+#include "onnx_model.h"
+
+namespace textreader {
+
+// The height the recogniser reads, and the width a line is padded to at least.
+constexpr int kRecogniserHeight = 48;
+constexpr int kRecogniserMinWidth = 320;
+
+struct Reading {
+  Decoded decoded;
+  // The crop's share of the network's input width: the CTC steps cover the
+  // whole (padded) input, the characters lie in this first part.
+  float content_share = 1.0F;
+  int steps = 0;
+};
+
+class Recogniser {
+ public:
+  // Throws ModelError when the model's classes do not match `alphabet`.
+  Recogniser(const std::string& path, Alphabet alphabet, int threads);
+
+  // Reads crops `kRecogniserHeight` pixels high (8-bit R G B (A)), batched by
+  // width; one reading per crop, in order.
+  std::vector<Reading> Read(const std::vector<cv::Mat>& crops) const;
+
+ private:
+  std::vector<Reading> ReadBatch(const std::vector<const cv::Mat*>& batch) const;
+
+  OnnxModel model_;
+  Alphabet alphabet_;
+};
+
+}  // namespace textreader
+
+#endif  // TEXTREADER_RECOGNISER_H_
