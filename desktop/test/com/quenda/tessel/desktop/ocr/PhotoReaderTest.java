@@ -11,6 +11,8 @@ import com.quenda.tessel.desktop.scenes.Backdrop;
 import com.quenda.tessel.desktop.scenes.Scene;
 import com.quenda.tessel.desktop.scenes.Scenes;
 import com.quenda.tessel.desktop.scenes.SignScene;
+import java.awt.Font;
+import java.io.File;
 import java.io.IOException;
 import java.nio.file.Files;
 import java.nio.file.Path;
@@ -104,6 +106,22 @@ class PhotoReaderTest {
     }
     // The English recogniser has no accents: what it reads drops them.
     assertTrue(!reader.read(rgb).get(0).text.contains("ó"));
+    rgb.release();
+  }
+
+  @Test
+  void chineseIsReadByTheChineseRecogniser() throws Exception {
+    Font cjk = Font.createFont(
+        Font.TRUETYPE_FONT, new File("/usr/share/fonts/truetype/wqy/wqy-microhei.ttc"));
+    Mat rgb = TextPictures.lines(cjk, 800, 260, "紧急出口", "请勿吸烟");
+    try (PhotoReader chinese = new PhotoReader("chi_sim")) {
+      assertEquals(PhotoReader.CHINESE, chinese.recogniser());
+      List<RecognizedLine> lines = chinese.read(rgb);
+      assertEquals(List.of("紧急出口", "请勿吸烟"), lines.stream().map(l -> l.text).toList());
+      assertEquals(PhotoReader.CHINESE, lines.get(0).reader);
+    }
+    // The English recogniser reads no Chinese, and what it makes of it is not kept as text.
+    assertEquals(List.of(), reader.read(rgb));
     rgb.release();
   }
 

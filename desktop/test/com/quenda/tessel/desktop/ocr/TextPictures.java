@@ -2,6 +2,7 @@ package com.quenda.tessel.desktop.ocr;
 
 import com.quenda.tessel.desktop.scenes.Fonts;
 import java.awt.Color;
+import java.awt.Font;
 import java.awt.Graphics2D;
 import java.awt.RenderingHints;
 import java.awt.image.BufferedImage;
@@ -17,6 +18,11 @@ final class TextPictures {
 
   /** {@code lines} in 40 px sans, one under the other, left-aligned at x 60. */
   static Mat lines(int width, int height, String... lines) {
+    return lines(Fonts.SANS, width, height, lines);
+  }
+
+  /** {@code lines} in 40 px {@code font}, one under the other, left-aligned at x 60. */
+  static Mat lines(Font font, int width, int height, String... lines) {
     BufferedImage picture = new BufferedImage(width, height, BufferedImage.TYPE_3BYTE_BGR);
     Graphics2D g = picture.createGraphics();
     g.setColor(Color.WHITE);
@@ -24,7 +30,7 @@ final class TextPictures {
     g.setColor(Color.DARK_GRAY);
     g.setRenderingHint(
         RenderingHints.KEY_TEXT_ANTIALIASING, RenderingHints.VALUE_TEXT_ANTIALIAS_ON);
-    g.setFont(Fonts.SANS.deriveFont(40f));
+    g.setFont(font.deriveFont(40f));
     for (int i = 0; i < lines.length; i++) {
       g.drawString(lines[i], 60, 90 + 80 * i);
     }
