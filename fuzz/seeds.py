@@ -92,6 +92,15 @@ def text(face, width, align, spacing, reference, utf8, repeat=0):
     return head + utf8.encode('utf-8', 'surrogatepass') if isinstance(utf8, str) else head + utf8
 
 
+def reader(rows, cols, channel_pick, sixteen_bit, setting, shapes=TEXT, bg=(230, 230, 230)):
+    """text_reader: size, channels (3, 1, 4), 16-bit, reader setting, then the image."""
+    return side(rows) + side(cols) + bytes([channel_pick, 0 if sixteen_bit else 1, setting]) + image(
+        bg=bg, shapes=shapes)
+
+
+BIG_TEXT = [(20, 60, 0, 0, (10, 10, 10), 2, (7, 2)), (20, 140, 0, 0, (200, 30, 30), 2, (5, 1))]
+
+
 SEEDS = {
     'inpainting_request': {
         'one-line': inpainting(60, 120, 0, [60, 30, 100, 24, 0]),
@@ -131,6 +140,16 @@ SEEDS = {
         'invalid-utf8': text(0, 8, 0, 0, 0, b'a\xff\xc0\xaf\xed\xa0\x80\xf4\x90\x80\x80ab\xe4\xb8'),
         'controls-breaks': text(2, 6, 2, 2, 1, 'a\r\nb\u2028c\u0085d\u0007\u202ee\u202cf \t\u3000'),
         'long-repeated': text(1, 3, 0, 0, 0, 'كلمة word 字 ', repeat=40),
+    },
+    'text_reader': {
+        'text-rgb': reader(200, 300, 0, False, 0, shapes=BIG_TEXT),
+        'text-rgba-boxes': reader(180, 260, 2, False, 2, shapes=BIG_TEXT, bg=(250, 250, 200)),
+        'tiny-detector': reader(120, 400, 0, False, 1, shapes=BIG_TEXT),
+        'one-pixel': reader(1, 1, 0, False, 0, shapes=()),
+        'thin-strip': reader(2, 400, 2, False, 0, shapes=TEXT),
+        'empty': reader(0, 50, 0, False, 0, shapes=()),
+        'grey-refused': reader(60, 60, 1, False, 0),
+        'sixteen-bit-refused': reader(60, 60, 0, True, 0),
     },
 }
 

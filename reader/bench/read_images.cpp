@@ -2,7 +2,8 @@
 // the file, the time taken and the lines read. For looking at what the reader
 // reads and for scripts/textreader/quality.py, which scores it.
 //   read_images [--long-side N] [--script latin|chinese] [--threads N]
-//               [--min-confidence F] [--box-threshold F] [--models DIR] FILE...
+//               [--min-confidence F] [--box-threshold F] [--min-width N]
+//               [--models DIR] FILE...
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
@@ -54,6 +55,8 @@ int main(int argc, char** argv) {
       options.min_confidence = std::strtof(argv[++i], nullptr);
     else if (arg == "--box-threshold" && has_value)
       options.box_threshold = std::strtof(argv[++i], nullptr);
+    else if (arg == "--min-width" && has_value)
+      options.recognition_min_width = std::atoi(argv[++i]);
     else if (arg == "--models" && has_value)
       options.model_dir = argv[++i];
     else

@@ -4,6 +4,8 @@
 #include <cmath>
 #include <numeric>
 
+#include <opencv2/imgproc.hpp>
+
 #include "box_geometry.h"
 
 namespace textreader {
@@ -90,6 +92,25 @@ TextLine Join(std::vector<TextLine> members) {
   return line;
 }
 
+// A faint blob in the gap between two words makes a box of its own, inside
+// the box of the line once the words are joined: the line holds whatever it
+// could read.
+std::vector<TextLine> WithoutNested(std::vector<TextLine> lines) {
+  const auto inside = [](const TextLine& outer, const TextLine& inner) {
+    return outer.rect.size.area() > inner.rect.size.area() &&
+           cv::pointPolygonTest(
+               std::vector<cv::Point2f>(outer.corners.begin(), outer.corners.end()),
+               inner.rect.center, false) > 0;
+  };
+  std::vector<TextLine> kept;
+  for (TextLine& line : lines) {
+    if (std::none_of(lines.begin(), lines.end(),
+                     [&](const TextLine& other) { return inside(other, line); }))
+      kept.push_back(line);
+  }
+  return kept;
+}
+
 }  // namespace
 
 std::vector<TextLine> GroupIntoLines(std::vector<TextLine> boxes) {
@@ -110,7 +131,7 @@ std::vector<TextLine> GroupIntoLines(std::vector<TextLine> boxes) {
     else if (group.size() > 1)
       lines.push_back(Join(std::move(group)));
   }
-  return lines;
+  return WithoutNested(std::move(lines));
 }
 
 void SortReadingOrder(std::vector<TextLine>& lines) {

@@ -12,7 +12,7 @@ namespace textreader {
 // rectangle): same reading direction, similar height, on one centre line,
 // with a gap of at most about a line's height between them. The texts join
 // with a space in reading order; the confidence is the mean weighted by
-// text length.
+// text length. A box inside the box of a larger line goes.
 std::vector<TextLine> GroupIntoLines(std::vector<TextLine> boxes);
 
 // Top to bottom; lines side by side (their centres within half a line's

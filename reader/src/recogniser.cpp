@@ -15,12 +15,12 @@ constexpr std::size_t kBatch = 6;
 
 }  // namespace
 
-Recogniser::Recogniser(const std::string& path, Alphabet alphabet, int threads)
-    : model_(path, 4, threads), alphabet_(std::move(alphabet)) {
+Recogniser::Recogniser(const std::string& path, Alphabet alphabet, int threads, int min_width)
+    : model_(path, 4, threads), alphabet_(std::move(alphabet)), min_width_(min_width) {
   // One blank line of the smallest width tells the class count.
   Tensor probe;
-  probe.shape = {1, 3, kRecogniserHeight, kRecogniserMinWidth};
-  probe.values.assign(3 * kRecogniserHeight * kRecogniserMinWidth, 0.0F);
+  probe.shape = {1, 3, kRecogniserHeight, min_width_};
+  probe.values.assign(3 * static_cast<std::size_t>(kRecogniserHeight) * min_width_, 0.0F);
   const Tensor output = model_.Run(probe);
   if (output.shape.size() != 3 || output.shape[2] != static_cast<std::int64_t>(alphabet_.size()))
     throw ModelError("recogniser's classes do not match its alphabet of " +
@@ -46,7 +46,7 @@ std::vector<Reading> Recogniser::Read(const std::vector<cv::Mat>& crops) const {
 }
 
 std::vector<Reading> Recogniser::ReadBatch(const std::vector<const cv::Mat*>& batch) const {
-  int width = kRecogniserMinWidth;
+  int width = min_width_;
   for (const cv::Mat* crop : batch)
     width = std::max(width, crop->cols);
   const std::size_t plane = static_cast<std::size_t>(kRecogniserHeight) * width;

@@ -13,9 +13,8 @@
 
 namespace textreader {
 
-// The height the recogniser reads, and the width a line is padded to at least.
+// The height the recogniser reads.
 constexpr int kRecogniserHeight = 48;
-constexpr int kRecogniserMinWidth = 320;
 
 struct Reading {
   Decoded decoded;
@@ -28,7 +27,8 @@ struct Reading {
 class Recogniser {
  public:
   // Throws ModelError when the model's classes do not match `alphabet`.
-  Recogniser(const std::string& path, Alphabet alphabet, int threads);
+  // Lines are padded to at least `min_width`.
+  Recogniser(const std::string& path, Alphabet alphabet, int threads, int min_width = 320);
 
   // Reads crops `kRecogniserHeight` pixels high (8-bit R G B (A)), batched by
   // width; one reading per crop, in order.
@@ -39,6 +39,7 @@ class Recogniser {
 
   OnnxModel model_;
   Alphabet alphabet_;
+  int min_width_;
 };
 
 }  // namespace textreader

@@ -1,5 +1,6 @@
 #include "textreader/text_reader.h"
 
+#include <chrono>
 #include <stdexcept>
 
 #include <opencv2/imgproc.hpp>
@@ -28,6 +29,9 @@ void CheckOptions(const ReaderOptions& options) {
   if (options.threads < 0 || options.threads > kMaxThreads)
     throw std::invalid_argument("text reader: threads must be in 0..256, not " +
                                 std::to_string(options.threads));
+  if (options.recognition_min_width < 8 || options.recognition_min_width > kMaxCropWidth)
+    throw std::invalid_argument("text reader: recognition_min_width must be in 8..4096, not " +
+                                std::to_string(options.recognition_min_width));
   if (!(options.min_confidence >= 0.0F && options.min_confidence <= 1.0F) ||
       !(options.box_threshold >= 0.0F && options.box_threshold <= 1.0F))
     throw std::invalid_argument("text reader: min_confidence and box_threshold must be in 0..1");
@@ -41,6 +45,20 @@ void CheckImage(const cv::Mat& image) {
                                 std::to_string(8 * image.elemSize1()) + "-bit with " +
                                 std::to_string(image.channels()) + " channel(s)");
 }
+
+// Milliseconds since the last lap.
+class Stopwatch {
+ public:
+  double Lap() {
+    const auto now = std::chrono::steady_clock::now();
+    const double ms = std::chrono::duration<double, std::milli>(now - last_).count();
+    last_ = now;
+    return ms;
+  }
+
+ private:
+  std::chrono::steady_clock::time_point last_ = std::chrono::steady_clock::now();
+};
 
 std::string ModelPath(const ReaderOptions& options, const char* file) {
   return options.model_dir + "/" + file;
@@ -61,7 +79,7 @@ struct TextReader::Models {
                    o.script == Script::kLatin
                        ? EnglishAlphabet()
                        : LoadDictionaryAlphabet(ModelPath(o, "ppocr_keys_v1.txt")),
-                   o.threads) {}
+                   o.threads, o.recognition_min_width) {}
 };
 
 TextReader::TextReader(const ReaderOptions& options) : options_(options) {
@@ -72,13 +90,19 @@ TextReader::TextReader(const ReaderOptions& options) : options_(options) {
 TextReader::~TextReader() = default;
 
 std::vector<TextLine> TextReader::Read(const cv::Mat& image) const {
+  return Read(image, nullptr);
+}
+
+std::vector<TextLine> TextReader::Read(const cv::Mat& image, ReadTimings* timings) const {
   CheckImage(image);
+  Stopwatch stopwatch;
 
   // 1. Where the text is: boxes from the detector's probability map.
   DbParameters db;
   db.box_threshold = options_.box_threshold;
   const std::vector<cv::RotatedRect> boxes = BoxesFromMap(
       models_->detector.ProbabilityMap(image, options_.detection_long_side), db, image.size());
+  const double detection_ms = stopwatch.Lap();
 
   // 2. Each box upright, as its text reads, and at the recogniser's height.
   std::vector<Corners> corners;
@@ -96,6 +120,8 @@ std::vector<TextLine> TextReader::Read(const cv::Mat& image) const {
     corners[i] = TurnedHalfway(corners[i]);
     cv::rotate(crops[i], crops[i], cv::ROTATE_180);
   }
+
+  const double classification_ms = stopwatch.Lap();
 
   // 4. The text of each box; misreadings (low confidence, nothing read) go.
   std::vector<TextLine> words;
@@ -120,6 +146,8 @@ std::vector<TextLine> TextReader::Read(const cv::Mat& image) const {
   // 5. Boxes that continue one another make one line; lines in reading order.
   std::vector<TextLine> lines = GroupIntoLines(std::move(words));
   SortReadingOrder(lines);
+  if (timings != nullptr)
+    *timings = {detection_ms, classification_ms, stopwatch.Lap(), static_cast<int>(boxes.size())};
   return lines;
 }
 

@@ -56,6 +56,10 @@ struct ReaderOptions {
   // A detected box is kept when the detector's mean text probability inside
   // it reaches this (0..1).
   float box_threshold = 0.6F;
+  // The recogniser reads each line padded to at least this width (pixels at
+  // 48 high). Its cost grows with the width: a short word padded to 320
+  // costs as much as a long line.
+  int recognition_min_width = 320;
 };
 
 struct CharacterBox {
@@ -69,6 +73,14 @@ struct TextLine {
   std::string text;                      // UTF-8
   float confidence = 0.0F;               // 0..1
   std::vector<CharacterBox> characters;  // only with ReaderOptions::character_boxes
+};
+
+// Where the time of one Read went, for measuring.
+struct ReadTimings {
+  double detection_ms = 0.0;       // the detector and its boxes
+  double classification_ms = 0.0;  // upright crops and the 0/180 classifier
+  double recognition_ms = 0.0;     // the recogniser, decoding and grouping
+  int boxes = 0;                   // boxes the detector found
 };
 
 class TextReader {
@@ -86,6 +98,8 @@ class TextReader {
   // image or another type; an image with no text gives no lines. Safe to call
   // from one thread at a time.
   std::vector<TextLine> Read(const cv::Mat& image) const;
+  // The same, telling where the time went.
+  std::vector<TextLine> Read(const cv::Mat& image, ReadTimings* timings) const;
 
  private:
   struct Models;
