@@ -33,6 +33,11 @@ public final class PhotoReader implements AutoCloseable {
    */
   static final int DETECTION_LONG_SIDE = 960;
   /**
+   * A picture smaller than that holds text that is small in pixels (a scanned page, a thumbnail):
+   * the detector sees it enlarged further, since it misses letters under about 8 px high.
+   */
+  static final int SMALL_PICTURE_DETECTION_LONG_SIDE = 1280;
+  /**
    * Line crops for Tesseract are this high: the detector's box holds the letters with a margin, so
    * their capitals come out some 30 px high, where Tesseract reads best.
    */
@@ -40,7 +45,10 @@ public final class PhotoReader implements AutoCloseable {
   /** A margin of background around each crop, which Tesseract wants around a line. */
   static final int CROP_MARGIN = 8;
 
+  private final Path modelDir;
   private final LearnedReader learned;
+  /** For pictures smaller than {@link #DETECTION_LONG_SIDE}; made when first needed. */
+  private LearnedReader smallPictures;
   private final String recogniser;
   /** Null when the learned recogniser reads the lines. */
   private final StripRecognizer tesseract;
@@ -69,9 +77,24 @@ public final class PhotoReader implements AutoCloseable {
         recogniser = TESSERACT;
         tesseract = tesseractFor(tesseractLanguage, programPath, timeoutMillis);
     }
-    learned = new LearnedReader(modelDir != null ? modelDir : LearnedReader.modelDir(),
+    this.modelDir = modelDir != null ? modelDir : LearnedReader.modelDir();
+    learned = open(DETECTION_LONG_SIDE);
+  }
+
+  private LearnedReader open(int detectionLongSide) throws HostException {
+    return new LearnedReader(modelDir,
         recogniser.equals(CHINESE) ? LearnedReader.Script.CHINESE : LearnedReader.Script.LATIN,
-        DETECTION_LONG_SIDE, tesseract == null);
+        detectionLongSide, tesseract == null);
+  }
+
+  private LearnedReader readerFor(Mat rgb) throws HostException {
+    if (Math.max(rgb.cols(), rgb.rows()) >= DETECTION_LONG_SIDE) {
+      return learned;
+    }
+    if (smallPictures == null) {
+      smallPictures = open(SMALL_PICTURE_DETECTION_LONG_SIDE);
+    }
+    return smallPictures;
   }
 
   private static StripRecognizer tesseractFor(
@@ -106,7 +129,7 @@ public final class PhotoReader implements AutoCloseable {
     }
     List<LearnedReader.Line> found;
     try {
-      found = learned.read(rgb);
+      found = readerFor(rgb).read(rgb);
     } catch (RuntimeException e) {
       throw new HostException(ExitStatus.INTERNAL, "the text reader failed: " + e.getMessage(), e);
     }
@@ -114,8 +137,11 @@ public final class PhotoReader implements AutoCloseable {
   }
 
   @Override
-  public void close() {
+  public synchronized void close() {
     learned.close();
+    if (smallPictures != null) {
+      smallPictures.close();
+    }
   }
 
   /** The learned reader's own readings, without those that are not text. */
