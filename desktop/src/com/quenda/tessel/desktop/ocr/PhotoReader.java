@@ -42,6 +42,11 @@ public final class PhotoReader implements AutoCloseable {
    * their capitals come out some 30 px high, where Tesseract reads best.
    */
   static final int CROP_HEIGHT = 56;
+  /**
+   * Learned readings surer than this are kept. On real photographs the recogniser's readings
+   * under 0.8 are mostly wrong (texture, or a word half hidden); above it mostly right.
+   */
+  static final double MIN_CONFIDENCE = 0.8;
   /** A margin of background around each crop, which Tesseract wants around a line. */
   static final int CROP_MARGIN = 8;
 
@@ -148,7 +153,7 @@ public final class PhotoReader implements AutoCloseable {
   private List<RecognizedLine> kept(List<LearnedReader.Line> found) {
     List<RecognizedLine> out = new ArrayList<>();
     for (LearnedReader.Line line : found) {
-      if (looksLikeText(line.text())) {
+      if (line.confidence() >= MIN_CONFIDENCE && looksLikeText(line.text())) {
         out.add(new RecognizedLine(line.text(), line.rect(), 100 * line.confidence(), recogniser));
       }
     }
