@@ -153,11 +153,16 @@ public final class PhotoReader implements AutoCloseable {
   private List<RecognizedLine> kept(List<LearnedReader.Line> found) {
     List<RecognizedLine> out = new ArrayList<>();
     for (LearnedReader.Line line : found) {
-      if (line.confidence() >= MIN_CONFIDENCE && looksLikeText(line.text())) {
+      if (worthTranslating(line.text(), line.confidence())) {
         out.add(new RecognizedLine(line.text(), line.rect(), 100 * line.confidence(), recogniser));
       }
     }
     return out;
+  }
+
+  /** Whether a learned reading (confidence 0..1) is sure enough and looks like text. */
+  static boolean worthTranslating(String text, double confidence) {
+    return confidence >= MIN_CONFIDENCE && looksLikeText(text);
   }
 
   /**

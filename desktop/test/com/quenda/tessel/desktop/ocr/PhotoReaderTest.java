@@ -195,6 +195,10 @@ class PhotoReaderTest {
     assertTrue(!PhotoReader.looksLikeText("a"));
     assertTrue(!PhotoReader.looksLikeText("-:|-"));
     assertTrue(!PhotoReader.looksLikeText("x--|"));
+    // Unsure readings are dropped however word-like they look.
+    assertTrue(PhotoReader.worthTranslating("Exit", 0.8));
+    assertTrue(!PhotoReader.worthTranslating("Exit", 0.79));
+    assertTrue(!PhotoReader.worthTranslating("|", 0.99));
   }
 
   @Test
