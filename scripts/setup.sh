@@ -28,6 +28,8 @@ packages=(
   # desktop host: OCR with its language data (osd: page orientation)
   tesseract-ocr tesseract-ocr-eng tesseract-ocr-spa tesseract-ocr-cat tesseract-ocr-fra
   tesseract-ocr-deu tesseract-ocr-osd
+  # the desktop host's tests read OpenCV's sample pages of small print
+  opencv-doc
   # desktop host: machine translation, every pair Debian has with English
   apertium apertium-eng-spa apertium-eng-cat apertium-en-gl apertium-hbs-eng
   apertium-isl-eng apertium-mkd-eng

@@ -4,22 +4,29 @@ import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
 import java.io.ByteArrayOutputStream;
+import java.io.DataOutputStream;
 import java.io.IOException;
 import java.io.PrintStream;
+import java.nio.ByteBuffer;
 import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.stream.Stream;
+import java.util.zip.CRC32;
+import java.util.zip.Deflater;
+import java.util.zip.DeflaterOutputStream;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
 import org.junit.jupiter.api.io.TempDir;
 import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
+import org.opencv.core.Point;
 import org.opencv.core.Scalar;
 import org.opencv.imgcodecs.Imgcodecs;
+import org.opencv.imgproc.Imgproc;
 
 /**
  * Every bad input ends in one line on standard error naming the problem (and the Debian package
@@ -128,5 +135,82 @@ class BadInputTest {
             new PrintStream(err, true, StandardCharsets.UTF_8));
     assertEquals(ExitStatus.CANNOT_WRITE, status);
     assertTrue(err.toString(StandardCharsets.UTF_8).contains("cannot write " + blocked));
+  }
+  @Test
+  void oddPicturesAreReadOrRefusedNeverACrash() throws IOException {
+    // A dot, a grey page and a 16-bit page are read (as 8-bit colour); the text on them is found.
+    Path dot = dir.resolve("dot.png");
+    Imgcodecs.imwrite(dot.toString(), new Mat(1, 1, CvType.CV_8UC3, new Scalar(0, 0, 0)));
+    Mat page = new Mat(160, 640, CvType.CV_8UC1, new Scalar(255));
+    Imgproc.putText(page, "Emergency exit", new Point(40, 100), Imgproc.FONT_HERSHEY_SIMPLEX, 1.6,
+        new Scalar(0), 4);
+    Path grey = dir.resolve("grey.png");
+    Imgcodecs.imwrite(grey.toString(), page);
+    Mat deep = new Mat();
+    page.convertTo(deep, CvType.CV_16UC1, 257);
+    Path sixteen = dir.resolve("sixteen.png");
+    Imgcodecs.imwrite(sixteen.toString(), deep);
+    Run run = run("photo", dot.toString(), grey.toString(), sixteen.toString(), "--quiet");
+    assertEquals(ExitStatus.OK, run.status, run.err);
+    assertTrue(Files.readString(run.out.resolve("dot.json")).contains("\"lines\": []"),
+        Files.readString(run.out.resolve("dot.json")));
+    for (String name : List.of("grey.json", "sixteen.json")) {
+      String json = Files.readString(run.out.resolve(name));
+      assertTrue(json.contains("\"text\": \"Emergency exit\""), name + ": " + json);
+    }
+
+    // 20000x20000 is refused from its header, before a gigabyte of pixels is decoded.
+    Path huge = dir.resolve("huge.png");
+    writeBlankPng(huge, 20000, 20000);
+    assertFails(run("photo", huge.toString()), ExitStatus.NOT_AN_IMAGE,
+        huge + ": 20000x20000 is too large (at most 8192 pixels a side)");
+  }
+
+  @Test
+  void missingModelsNameTheFileAndTheSetupScript() throws IOException {
+    String models = System.getProperty("ocr.models");
+    System.setProperty("ocr.models", dir.resolve("no-models").toString());
+    try {
+      Run run = run("photo", good.toString());
+      assertEquals(ExitStatus.MISSING_OCR_DATA, run.status, run.err);
+      assertTrue(
+          run.err.startsWith("translate: the text reader cannot load its models: "), run.err);
+      assertTrue(run.err.contains(dir.resolve("no-models").toString()), run.err);
+      assertTrue(run.err.endsWith(" (run scripts/setup.sh to install them)\n"), run.err);
+      assertEquals(1, run.err.lines().count(), run.err);
+    } finally {
+      System.setProperty("ocr.models", models);
+    }
+  }
+
+  /** A grey PNG of {@code width}x{@code height} zeros, written row by row without the pixels. */
+  static void writeBlankPng(Path path, int width, int height) throws IOException {
+    ByteArrayOutputStream idat = new ByteArrayOutputStream();
+    try (DeflaterOutputStream z =
+             new DeflaterOutputStream(idat, new Deflater(Deflater.BEST_SPEED), 1 << 16)) {
+      byte[] row = new byte[width + 1]; // filter byte 0, then the row's zeros
+      for (int y = 0; y < height; y++) {
+        z.write(row);
+      }
+    }
+    try (DataOutputStream png = new DataOutputStream(Files.newOutputStream(path))) {
+      png.write(new byte[] {(byte) 0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'});
+      ByteBuffer header = ByteBuffer.allocate(13).putInt(width).putInt(height);
+      header.put((byte) 8).put((byte) 0).put((byte) 0).put((byte) 0).put((byte) 0);
+      chunk(png, "IHDR", header.array());
+      chunk(png, "IDAT", idat.toByteArray());
+      chunk(png, "IEND", new byte[0]);
+    }
+  }
+
+  private static void chunk(DataOutputStream png, String type, byte[] data) throws IOException {
+    byte[] name = type.getBytes(StandardCharsets.US_ASCII);
+    CRC32 crc = new CRC32();
+    crc.update(name);
+    crc.update(data);
+    png.writeInt(data.length);
+    png.write(name);
+    png.write(data);
+    png.writeInt((int) crc.getValue());
   }
 }

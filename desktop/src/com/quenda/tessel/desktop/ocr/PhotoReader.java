@@ -3,51 +3,108 @@ package com.quenda.tessel.desktop.ocr;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.ocr.TsvPages.Word;
+import java.nio.file.Path;
 import java.util.ArrayList;
-import java.util.Comparator;
 import java.util.List;
 import java.util.Locale;
+import org.opencv.core.Core;
 import org.opencv.core.CvType;
 import org.opencv.core.Mat;
-import org.opencv.core.Point;
-import org.opencv.core.RotatedRect;
-import org.opencv.core.Size;
 import org.opencv.imgproc.Imgproc;
 
 /**
- * Reads the text lines of a photograph: finds them first (the recogniser's own page layout fails
- * on tilted lines and busy photographs), then straightens each line and has the {@code tesseract}
- * program read all of them as single lines in one run.
+ * Reads the text lines of a photograph with the learned text reader: it finds the lines (at any
+ * angle, upside down included) and, for English and Chinese, reads them too. The recognisers know
+ * English letters and Chinese characters but not the accented letters of other languages (ñ, ç,
+ * ß, ö, ...): for those the reader's lines are still used, and each line, cut out upright, is read
+ * by the {@code tesseract} program with that language's data, all lines of a picture in one run.
  *
- * <p>Orientation, two cheap rules. Per line: a line not read, or read with a confidence under
- * {@link #SURE_CONFIDENCE}, is read again turned by 180° in one more run for all such lines, and
- * the surer reading kept (an upside-down page or sign). Per picture: the line finder only looks
- * for rows within 40° of horizontal, so before reading, the candidates are also linked as if the
- * picture were transposed; when far more of them stand in columns than in rows, the picture is
- * held sideways, the recogniser's orientation detection (page segmentation mode 0) says which way
- * to turn it, and the turned picture is read (if it cannot tell, a quarter turn clockwise, and the
- * per-line rule catches the lines that end up upside down). A line's angle then gives its reading
- * direction: about 90 for text running down, about 180 for text upside down.
+ * <p>Every line says which recogniser read it: {@link #LATIN}, {@link #CHINESE} or {@link
+ * #TESSERACT}.
  */
 public final class PhotoReader implements AutoCloseable {
   public static final long DEFAULT_TIMEOUT_MILLIS = 60_000;
-  /** Detection runs on at most this many pixels across; strips are cut at full resolution. */
-  static final int DETECTION_SIZE = 1600;
-  /** Lines read with less confidence are also read turned by 180°. */
-  static final double SURE_CONFIDENCE = 80;
+  public static final String LATIN = "learned-latin";
+  public static final String CHINESE = "learned-chinese";
+  public static final String TESSERACT = "tesseract";
+  /**
+   * The detector sees the picture scaled to this long side: large enough for the small print of a
+   * page or a receipt, small enough that a sign's letters are not cut into pieces.
+   */
+  static final int DETECTION_LONG_SIDE = 960;
+  /**
+   * A picture smaller than that holds text that is small in pixels (a scanned page, a thumbnail):
+   * the detector sees it enlarged further, since it misses letters under about 8 px high.
+   */
+  static final int SMALL_PICTURE_DETECTION_LONG_SIDE = 1280;
+  /**
+   * Line crops for Tesseract are this high: the detector's box holds the letters with a margin, so
+   * their capitals come out some 30 px high, where Tesseract reads best.
+   */
+  static final int CROP_HEIGHT = 56;
+  /**
+   * Learned readings surer than this are kept. On real photographs the recogniser's readings
+   * under 0.8 are mostly wrong (texture, or a word half hidden); above it mostly right.
+   */
+  static final double MIN_CONFIDENCE = 0.8;
+  /** A margin of background around each crop, which Tesseract wants around a line. */
+  static final int CROP_MARGIN = 8;
 
-  private final TesseractProgram program;
-  private final StripRecognizer recognizer;
-  private final boolean canDetectOrientation;
+  private final Path modelDir;
+  private final LearnedReader learned;
+  /** For pictures smaller than {@link #DETECTION_LONG_SIDE}; made when first needed. */
+  private LearnedReader smallPictures;
+  private final String recogniser;
+  /** Null when the learned recogniser reads the lines. */
+  private final StripRecognizer tesseract;
 
+  /** A reader for text in the language Tesseract calls {@code tesseractLanguage}. */
   public PhotoReader(String tesseractLanguage) throws HostException {
-    this(tesseractLanguage, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS);
+    this(tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS);
   }
 
-  /** With another program or time limit per run of it (tests stand in a hanging program). */
-  PhotoReader(String tesseractLanguage, String programPath, long timeoutMillis)
+  /**
+   * With another model folder (null: the one the launcher names), or another program or time
+   * limit per run of it (tests stand in a hanging program).
+   */
+  PhotoReader(String tesseractLanguage, Path modelDir, String programPath, long timeoutMillis)
       throws HostException {
-    program = new TesseractProgram(programPath, timeoutMillis);
+    switch (tesseractLanguage) {
+      case "eng":
+        recogniser = LATIN;
+        tesseract = null;
+        break;
+      case "chi_sim":
+        recogniser = CHINESE;
+        tesseract = null;
+        break;
+      default:
+        recogniser = TESSERACT;
+        tesseract = tesseractFor(tesseractLanguage, programPath, timeoutMillis);
+    }
+    this.modelDir = modelDir != null ? modelDir : LearnedReader.modelDir();
+    learned = open(DETECTION_LONG_SIDE);
+  }
+
+  private LearnedReader open(int detectionLongSide) throws HostException {
+    return new LearnedReader(modelDir,
+        recogniser.equals(CHINESE) ? LearnedReader.Script.CHINESE : LearnedReader.Script.LATIN,
+        detectionLongSide, tesseract == null);
+  }
+
+  private LearnedReader readerFor(Mat rgb) throws HostException {
+    if (Math.max(rgb.cols(), rgb.rows()) >= DETECTION_LONG_SIDE) {
+      return learned;
+    }
+    if (smallPictures == null) {
+      smallPictures = open(SMALL_PICTURE_DETECTION_LONG_SIDE);
+    }
+    return smallPictures;
+  }
+
+  private static StripRecognizer tesseractFor(
+      String tesseractLanguage, String programPath, long timeoutMillis) throws HostException {
+    TesseractProgram program = new TesseractProgram(programPath, timeoutMillis);
     List<String> installed = program.languages();
     for (String lang : tesseractLanguage.split("\\+")) {
       if (!installed.contains(lang)) {
@@ -56,8 +113,7 @@ public final class PhotoReader implements AutoCloseable {
                 + debianPackage(lang));
       }
     }
-    recognizer = new StripRecognizer(program, tesseractLanguage);
-    canDetectOrientation = installed.contains("osd");
+    return new StripRecognizer(program, tesseractLanguage);
   }
 
   /** tesseract-ocr-chi-sim for chi_sim. */
@@ -65,226 +121,123 @@ public final class PhotoReader implements AutoCloseable {
     return "tesseract-ocr-" + lang.replace('_', '-').toLowerCase(Locale.ROOT);
   }
 
-  /** The text lines of an 8-bit RGB picture, top to bottom. */
-  public List<RecognizedLine> read(Mat rgb) throws HostException {
+  /** Which recogniser reads the lines: {@link #LATIN}, {@link #CHINESE} or {@link #TESSERACT}. */
+  public String recogniser() {
+    return recogniser;
+  }
+
+  /** The text lines of an 8-bit RGB picture, in reading order. */
+  public synchronized List<RecognizedLine> read(Mat rgb) throws HostException {
     if (rgb.empty() || rgb.type() != CvType.CV_8UC3) {
       throw new HostException(
           ExitStatus.INTERNAL, "OCR needs a non-empty 8-bit RGB picture, got " + rgb);
     }
-    Mat grey = new Mat();
-    Imgproc.cvtColor(rgb, grey, Imgproc.COLOR_RGB2GRAY);
+    List<LearnedReader.Line> found;
     try {
-      return sorted(wholeLines(readGrey(grey, true), rgb.size()));
-    } finally {
-      grey.release();
+      found = readerFor(rgb).read(rgb);
+    } catch (RuntimeException e) {
+      throw new HostException(ExitStatus.INTERNAL, "the text reader failed: " + e.getMessage(), e);
     }
+    return tesseract == null ? kept(found) : readWithTesseract(rgb, found);
   }
 
   @Override
-  public void close() {}
+  public synchronized void close() {
+    learned.close();
+    if (smallPictures != null) {
+      smallPictures.close();
+    }
+  }
+
+  /** The learned reader's own readings, without those that are not text. */
+  private List<RecognizedLine> kept(List<LearnedReader.Line> found) {
+    List<RecognizedLine> out = new ArrayList<>();
+    for (LearnedReader.Line line : found) {
+      if (worthTranslating(line.text(), line.confidence())) {
+        out.add(new RecognizedLine(line.text(), line.rect(), 100 * line.confidence(), recogniser));
+      }
+    }
+    return out;
+  }
+
+  /** Whether a learned reading (confidence 0..1) is sure enough and looks like text. */
+  static boolean worthTranslating(String text, double confidence) {
+    return confidence >= MIN_CONFIDENCE && looksLikeText(text);
+  }
 
   /**
-   * Without the lines that run off the picture: where a line's rectangle reaches past the edge its
-   * text is cut, and what is left in view ("ts sold he") is neither the sign's text nor anything
-   * to translate.
+   * Whether a reading is worth translating: two letters or digits at least, and mostly letters or
+   * digits. Texture, a pole or a plate's edge that the detector takes for text reads as a symbol
+   * or two ("|", "-:"), which is nothing to translate and erasing it would damage the picture.
    */
-  private static List<RecognizedLine> wholeLines(List<RecognizedLine> lines, Size picture) {
-    List<RecognizedLine> whole = new ArrayList<>();
-    Point[] corners = new Point[4];
-    for (RecognizedLine line : lines) {
-      line.rect.points(corners);
-      boolean cut = false;
-      for (Point p : corners) {
-        cut |= p.x < 0 || p.y < 0 || p.x > picture.width || p.y > picture.height;
-      }
-      if (!cut) {
-        whole.add(line);
+  static boolean looksLikeText(String text) {
+    int alnum = 0;
+    int other = 0;
+    for (int i = 0; i < text.length(); i = text.offsetByCodePoints(i, 1)) {
+      int c = text.codePointAt(i);
+      if (Character.isLetterOrDigit(c)) {
+        alnum++;
+      } else if (!Character.isWhitespace(c)) {
+        other++;
       }
     }
-    return whole;
+    return alnum >= 2 && alnum >= 2 * other;
   }
 
-  private List<RecognizedLine> readGrey(Mat grey, boolean mayTurn) throws HostException {
-    double f = Math.min(1.0, DETECTION_SIZE / (double) Math.max(grey.cols(), grey.rows()));
-    Mat small = grey;
-    if (f < 1) {
-      small = new Mat();
-      Imgproc.resize(grey, small, new Size(), f, f, Imgproc.INTER_AREA);
-    }
-    List<Component> components = new CharacterDetector((int) small.total()).detect(small);
-    if (small != grey) {
-      small.release();
-    }
-    try {
-      if (mayTurn && sideways(components)) {
-        int turn = canDetectOrientation ? PageOrientation.clockwiseTurn(program, grey) : 0;
-        turn = turn == 270 ? 270 : 90; // if unsure, lines upside down are turned line by line
-        Mat turned = PageOrientation.turn(grey, turn);
-        try {
-          return turnBack(readGrey(turned, false), turn, grey.cols(), grey.rows());
-        } finally {
-          turned.release();
-        }
-      }
-      return readRows(grey, new LineGrouper().group(components), f);
-    } finally {
-      for (Component c : components) {
-        c.points.release();
-      }
-    }
-  }
-
-  /** Reads the rows found at detection scale {@code f}, unsure ones also upside down. */
-  private List<RecognizedLine> readRows(Mat grey, List<TextLine> lines, double f)
+  /** Each line cut out upright and read by Tesseract; lines it reads as no text are dropped. */
+  private List<RecognizedLine> readWithTesseract(Mat rgb, List<LearnedReader.Line> found)
       throws HostException {
-    List<RotatedRect> rects = new ArrayList<>();
-    for (TextLine l : lines) {
-      RotatedRect r = new RotatedRect(new Point(l.rect.center.x / f, l.rect.center.y / f),
-          new Size(l.rect.size.width / f, l.rect.size.height / f), l.rect.angle);
-      rects.add(TrailingMarks.widen(grey, r, l.bright));
-    }
-    List<List<Word>> words = recognise(grey, lines, rects, false);
-    RecognizedLine[] best = new RecognizedLine[lines.size()];
-    List<Integer> retry = new ArrayList<>();
-    for (int i = 0; i < lines.size(); i++) {
-      TextFilter.Reading r = TextFilter.accept(words.get(i));
-      if (r != null) {
-        best[i] = result(lines.get(i), rects.get(i), r, false, f);
+    List<Mat> crops = new ArrayList<>();
+    try {
+      for (LearnedReader.Line line : found) {
+        crops.add(darkOnLight(LearnedReader.uprightCrop(rgb, line.rect(), CROP_HEIGHT)));
       }
-      if (r == null || r.confidence() < SURE_CONFIDENCE) {
-        retry.add(i);
-      }
-    }
-    List<TextLine> retryLines = new ArrayList<>();
-    List<RotatedRect> retryRects = new ArrayList<>();
-    for (int i : retry) {
-      retryLines.add(lines.get(i));
-      retryRects.add(rects.get(i));
-    }
-    List<List<Word>> turned = recognise(grey, retryLines, retryRects, true);
-    for (int k = 0; k < retry.size(); k++) {
-      int i = retry.get(k);
-      TextFilter.Reading r = TextFilter.accept(turned.get(k));
-      if (r != null && (best[i] == null || r.confidence() > best[i].confidence)) {
-        best[i] = result(retryLines.get(k), retryRects.get(k), r, true, f);
-      }
-    }
-    List<RecognizedLine> out = new ArrayList<>();
-    for (RecognizedLine l : best) {
-      if (l != null) {
-        out.add(l);
-      }
-    }
-    return out;
-  }
-
-  /**
-   * A picture held sideways: at least 30 candidates stand in vertical rows, and more than twice as
-   * many as in horizontal ones.
-   */
-  private static boolean sideways(List<Component> components) {
-    List<Component> transposed = new ArrayList<>();
-    for (Component c : components) {
-      transposed.add(c.transposed());
-    }
-    int across = LineGrouper.candidatesInRows(components);
-    int down = LineGrouper.candidatesInRows(transposed);
-    return down >= 30 && down > 2 * across;
-  }
-
-  /**
-   * The line as read. When the words kept span less than the line (a fragment of a plate's edge
-   * or texture joined the row but was not read as text), the rectangle is remade from the
-   * candidates under the words.
-   */
-  private static RecognizedLine result(
-      TextLine line, RotatedRect rect, TextFilter.Reading reading, boolean upsideDown, double f) {
-    double from = Double.MAX_VALUE;
-    double to = -Double.MAX_VALUE;
-    for (Word w : reading.words()) {
-      double a = LineRectifier.alongLine(rect, w.left(), upsideDown);
-      double b = LineRectifier.alongLine(rect, w.left() + w.width(), upsideDown);
-      from = Math.min(from, Math.min(a, b));
-      to = Math.max(to, Math.max(a, b));
-    }
-    double slack = 0.3 * rect.size.height;
-    RotatedRect r = rect;
-    if (from > -rect.size.width / 2 + slack || to < rect.size.width / 2 - slack) {
-      double t = Math.toRadians(line.rect.angle);
-      List<Component> under = new ArrayList<>();
-      for (Component c : line.parts) {
-        double u = ((c.cx() - line.rect.center.x) * Math.cos(t)
-                       + (c.cy() - line.rect.center.y) * Math.sin(t))
-            / f;
-        if (u >= from - slack && u <= to + slack) {
-          under.add(c);
+      List<List<Word>> words = tesseract.read(crops);
+      List<RecognizedLine> out = new ArrayList<>();
+      for (int i = 0; i < found.size(); i++) {
+        TextFilter.Reading reading = TextFilter.accept(words.get(i));
+        if (reading != null) {
+          out.add(new RecognizedLine(
+              reading.text(), found.get(i).rect(), reading.confidence(), TESSERACT));
         }
       }
-      RotatedRect ink = under.isEmpty() ? null : InkRect.of(under, line.rect.angle);
-      if (ink != null && under.size() < line.parts.size()) {
-        r = new RotatedRect(new Point(ink.center.x / f, ink.center.y / f),
-            new Size(ink.size.width / f, ink.size.height / f), ink.angle);
-      }
-    }
-    double angle = upsideDown ? reverse(r.angle) : r.angle;
-    return new RecognizedLine(
-        reading.text(), new RotatedRect(r.center, r.size, angle), reading.confidence());
-  }
-
-  private List<List<Word>> recognise(Mat grey, List<TextLine> lines, List<RotatedRect> rects,
-      boolean upsideDown) throws HostException {
-    List<Mat> strips = new ArrayList<>();
-    for (int i = 0; i < lines.size(); i++) {
-      strips.add(LineRectifier.strip(grey, rects.get(i), lines.get(i).bright, upsideDown));
-    }
-    try {
-      return recognizer.read(strips);
+      return out;
     } finally {
-      for (Mat s : strips) {
-        s.release();
+      for (Mat crop : crops) {
+        crop.release();
       }
     }
-  }
-
-  /** The angle of the same line read the other way, in (-180, 180]. */
-  static double reverse(double angle) {
-    double a = angle + 180;
-    return a > 180 ? a - 360 : a;
   }
 
   /**
-   * Lines read in a picture turned clockwise by {@code turn}, brought back to the original
-   * picture of {@code width}×{@code height}.
+   * The crop in grey, dark letters on a light ground with a margin of ground around it: Tesseract
+   * reads dark on light best, and its own second try in negative is turned off. The ground is what
+   * the crop's edge shows (the box holds the letters with a margin); when it is darker than Otsu's
+   * threshold the letters are light and the crop is inverted.
    */
-  static List<RecognizedLine> turnBack(
-      List<RecognizedLine> lines, int turn, int width, int height) {
-    List<RecognizedLine> out = new ArrayList<>();
-    for (RecognizedLine l : lines) {
-      double x = l.rect.center.x;
-      double y = l.rect.center.y;
-      Point c;
-      switch (turn) {
-        case 90: // (x, y) went to (height - 1 - y, x)
-          c = new Point(y, height - 1 - x);
-          break;
-        case 180:
-          c = new Point(width - 1 - x, height - 1 - y);
-          break;
-        default: // 270: (x, y) went to (y, width - 1 - x)
-          c = new Point(width - 1 - y, x);
-      }
-      double a = l.rect.angle - turn;
-      while (a <= -180) {
-        a += 360;
-      }
-      out.add(new RecognizedLine(l.text, new RotatedRect(c, l.rect.size, a), l.confidence));
+  static Mat darkOnLight(Mat rgbCrop) {
+    Mat grey = new Mat();
+    Imgproc.cvtColor(rgbCrop, grey, Imgproc.COLOR_RGB2GRAY);
+    rgbCrop.release();
+    Mat ink = new Mat();
+    double threshold = Imgproc.threshold(grey, ink, 0, 255, Imgproc.THRESH_OTSU);
+    ink.release();
+    if (edgeMean(grey) < threshold) {
+      Core.bitwise_not(grey, grey);
     }
+    Mat out = new Mat();
+    Core.copyMakeBorder(
+        grey, out, CROP_MARGIN, CROP_MARGIN, CROP_MARGIN, CROP_MARGIN, Core.BORDER_REPLICATE);
+    grey.release();
     return out;
   }
 
-  private static List<RecognizedLine> sorted(List<RecognizedLine> lines) {
-    lines.sort(Comparator.comparingDouble((RecognizedLine l) -> l.rect.center.y)
-                   .thenComparingDouble(l -> l.rect.center.x));
-    return lines;
+  /** The mean of the outermost rows and columns of a grey image. */
+  private static double edgeMean(Mat grey) {
+    int w = grey.cols();
+    int h = grey.rows();
+    double sum = Core.sumElems(grey.row(0)).val[0] + Core.sumElems(grey.row(h - 1)).val[0]
+        + Core.sumElems(grey.col(0)).val[0] + Core.sumElems(grey.col(w - 1)).val[0];
+    return sum / (2.0 * w + 2.0 * h);
   }
 }

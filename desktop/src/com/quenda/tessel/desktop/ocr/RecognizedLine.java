@@ -7,18 +7,21 @@ import org.opencv.core.RotatedRect;
  *
  * <p>{@code rect} is in the input image's pixels, in OpenCV's {@code RotatedRect} convention
  * (centre, size, angle in degrees, y down), with the width running along the text: the rectangle
- * hugs the line's ink as an OCR box does, before the engine's inpainting ratios are applied.
+ * holds the line's letters as an OCR box does, before the engine's inpainting ratios are applied.
  */
 public final class RecognizedLine {
   public final String text;
   public final RotatedRect rect;
-  /** Mean word confidence, 0..100. */
+  /** How sure the recogniser is of the text, 0..100. */
   public final double confidence;
+  /** Which recogniser read the text (see {@link PhotoReader#recogniser()}). */
+  public final String reader;
 
-  public RecognizedLine(String text, RotatedRect rect, double confidence) {
+  public RecognizedLine(String text, RotatedRect rect, double confidence, String reader) {
     this.text = text;
     this.rect = rect;
     this.confidence = confidence;
+    this.reader = reader;
   }
 
   @Override

@@ -56,6 +56,7 @@ public final class LineResult {
             line.rect.size.height, line.rect.angle});
     json.put("color", translated() ? hex(color) : null);
     json.put("confidence", Math.round(line.confidence));
+    json.put("reader", line.reader);
     if (align != null) {
       json.put("block", block);
       json.put("size_ratio", translated() ? Math.round(sizeRatio * 1000) / 1000.0 : null);

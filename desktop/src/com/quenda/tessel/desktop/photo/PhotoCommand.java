@@ -27,8 +27,15 @@ public final class PhotoCommand {
   public static void run(CommandLine command, PrintStream out, PrintStream err)
       throws HostException {
     List<PhotoInput> inputs = checkInputs(command.inputs);
-    PhotoJob job = new PhotoJob(new PhotoReader(command.from.tesseract),
-        Translators.create(command.from, command.to, command.translations), command.to);
+    try (PhotoReader reader = new PhotoReader(command.from.tesseract)) {
+      run(command, inputs, reader, out, err);
+    }
+  }
+
+  private static void run(CommandLine command, List<PhotoInput> inputs, PhotoReader reader,
+      PrintStream out, PrintStream err) throws HostException {
+    PhotoJob job = new PhotoJob(
+        reader, Translators.create(command.from, command.to, command.translations), command.to);
     OutputFiles files = new OutputFiles(command.out);
 
     Progress progress = new Progress(STEPS_PER_PHOTO * inputs.size(), command.quiet, err);

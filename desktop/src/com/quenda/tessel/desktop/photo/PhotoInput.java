@@ -5,6 +5,10 @@ import com.quenda.tessel.desktop.HostException;
 import java.io.IOException;
 import java.nio.file.Files;
 import java.nio.file.Path;
+import java.util.Iterator;
+import javax.imageio.ImageIO;
+import javax.imageio.ImageReader;
+import javax.imageio.stream.ImageInputStream;
 import org.opencv.core.Mat;
 import org.opencv.imgcodecs.Imgcodecs;
 import org.opencv.imgproc.Imgproc;
@@ -42,8 +46,40 @@ public final class PhotoInput {
       throw new HostException(ExitStatus.NO_INPUT, path + ": cannot be read");
     }
     PhotoInput input = new PhotoInput(path);
+    input.checkSize(headerSize(path));
     input.decode().release();
     return input;
+  }
+
+  /**
+   * The width and height that the file's header declares, or null when Java's image readers do
+   * not know the format (OpenCV may still): a picture too large is refused before its pixels are
+   * decoded, which for 20000×20000 would take over a gigabyte.
+   */
+  static int[] headerSize(Path path) {
+    try (ImageInputStream stream = ImageIO.createImageInputStream(path.toFile())) {
+      Iterator<ImageReader> readers = stream == null ? null : ImageIO.getImageReaders(stream);
+      if (readers == null || !readers.hasNext()) {
+        return null;
+      }
+      ImageReader reader = readers.next();
+      try {
+        reader.setInput(stream, true, true);
+        return new int[] {reader.getWidth(0), reader.getHeight(0)};
+      } finally {
+        reader.dispose();
+      }
+    } catch (IOException | RuntimeException e) {
+      return null; // a damaged header: OpenCV's decoder gives the verdict
+    }
+  }
+
+  private void checkSize(int[] size) throws HostException {
+    if (size != null && (size[0] > MAX_SIDE || size[1] > MAX_SIDE)) {
+      throw new HostException(ExitStatus.NOT_AN_IMAGE,
+          path + ": " + size[0] + "x" + size[1] + " is too large (at most " + MAX_SIDE
+              + " pixels a side)");
+    }
   }
 
   /** The image as 8-bit RGB; the caller releases it. */
@@ -53,11 +89,10 @@ public final class PhotoInput {
       bgr.release();
       throw new HostException(ExitStatus.NOT_AN_IMAGE, path + ": not an image OpenCV can read");
     }
-    if (bgr.cols() > MAX_SIDE || bgr.rows() > MAX_SIDE) {
-      String size = bgr.cols() + "x" + bgr.rows();
+    int[] size = {bgr.cols(), bgr.rows()};
+    if (size[0] > MAX_SIDE || size[1] > MAX_SIDE) {
       bgr.release();
-      throw new HostException(ExitStatus.NOT_AN_IMAGE,
-          path + ": " + size + " is too large (at most " + MAX_SIDE + " pixels a side)");
+      checkSize(size);
     }
     Mat rgb = new Mat();
     Imgproc.cvtColor(bgr, rgb, Imgproc.COLOR_BGR2RGB);

@@ -9,11 +9,6 @@ import java.util.Map;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
 import org.opencv.core.Core;
-import org.opencv.core.CvType;
-import org.opencv.core.Mat;
-import org.opencv.core.Point;
-import org.opencv.core.RotatedRect;
-import org.opencv.core.Size;
 
 /** The rules applied to the OCR program's output, without running it. */
 class ReadingRulesTest {
@@ -55,31 +50,6 @@ class ReadingRulesTest {
     assertEquals("No", TextFilter.accept(List.of(w("No", 93))).text());
     assertNull(TextFilter.accept(List.of(w("—", 95), w("=", 95))));
     assertNull(TextFilter.accept(List.of(w("a", 95), w("1", 95), w("&", 95))));
-  }
-
-  @Test
-  void orientationIsTakenOnlyWhenConfident() {
-    assertEquals(90, PageOrientation.parse("Rotate: 90\nOrientation confidence: 14.54\n"));
-    assertEquals(270, PageOrientation.parse("Rotate: 270\nOrientation confidence: 2.5\n"));
-    assertEquals(0, PageOrientation.parse("Rotate: 180\nOrientation confidence: 1.2\n"));
-    assertEquals(0, PageOrientation.parse("Too few characters. Skipping this page\n"));
-  }
-
-  @Test
-  void linesReadInATurnedPictureLandWhereTheyStandInTheOriginal() {
-    int width = 64;
-    int height = 48;
-    Point original = new Point(50, 10);
-    for (int turn : new int[] {90, 180, 270}) {
-      Mat picture = Mat.zeros(height, width, CvType.CV_8UC1);
-      picture.put((int) original.y, (int) original.x, 255);
-      Mat turned = PageOrientation.turn(picture, turn);
-      Point seen = Core.minMaxLoc(turned).maxLoc;
-      RecognizedLine read = new RecognizedLine("x", new RotatedRect(seen, new Size(30, 8), 5), 90);
-      RotatedRect back = PhotoReader.turnBack(List.of(read), turn, width, height).get(0).rect;
-      assertEquals(original, back.center, "turn " + turn);
-      assertEquals(5 - turn + (turn > 180 ? 360 : 0), back.angle, 1e-9, "turn " + turn);
-    }
   }
 
   private static Word w(String text, double confidence) {
