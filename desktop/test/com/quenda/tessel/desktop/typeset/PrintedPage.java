@@ -1,5 +1,6 @@
 package com.quenda.tessel.desktop.typeset;
 
+import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import java.awt.Color;
 import java.awt.Font;
@@ -74,7 +75,7 @@ final class PrintedPage {
     RecognizedLine line = new RecognizedLine(text,
         new RotatedRect(new Point(start + ink.getCenterX(), baseline + ink.getCenterY()),
             new Size(ink.getWidth(), ink.getHeight()), 0),
-        90);
+        90, PhotoReader.LATIN);
     lines.add(line);
     return line;
   }
