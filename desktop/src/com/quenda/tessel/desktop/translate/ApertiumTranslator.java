@@ -8,6 +8,7 @@ import java.io.IOException;
 import java.io.PrintStream;
 import java.nio.file.Files;
 import java.nio.file.Path;
+import java.text.BreakIterator;
 import java.util.ArrayList;
 import java.util.HashSet;
 import java.util.List;
@@ -19,7 +20,9 @@ import java.util.regex.Pattern;
 
 /**
  * Translation by Apertium, kept running for the whole run, with the sign memory and the editing
- * rules around it. Each text is translated on its own, in this order:
+ * rules around it. Each text is translated on its own, and a text of several sentences (a
+ * paragraph read as one block) sentence by sentence, so that the memory and the rules see each
+ * sentence whole as they would see it on a sign. Each sentence, in this order:
  *
  * <ol>
  *   <li>its case is noted and the text put in sentence case ({@link CaseStyle});
@@ -119,6 +122,10 @@ public final class ApertiumTranslator implements Translator {
     if (flat.isEmpty()) {
       return null;
     }
+    List<String> sentences = sentences(flat);
+    if (sentences.size() > 1) {
+      return bySentence(sentences);
+    }
     Matcher request = LATER_REQUEST.matcher(flat);
     if (request.find() && request.start() > 0) {
       // "Wet floor, please walk carefully": the request is a sentence of its own.
@@ -147,6 +154,37 @@ public final class ApertiumTranslator implements Translator {
       translation = edit.finish(plain);
     }
     return style.apply(translation, flat, to.iso);
+  }
+
+  /** The sentences of a text, in order; one for a text of one sentence. */
+  static List<String> sentences(String text) {
+    BreakIterator breaks = BreakIterator.getSentenceInstance(Locale.ENGLISH);
+    breaks.setText(text);
+    List<String> sentences = new ArrayList<>();
+    for (int start = breaks.first(), end = breaks.next(); end != BreakIterator.DONE;
+         start = end, end = breaks.next()) {
+      String sentence = text.substring(start, end).strip();
+      if (!sentence.isEmpty()) {
+        sentences.add(sentence);
+      }
+    }
+    return sentences;
+  }
+
+  /**
+   * Each sentence translated on its own and joined again; one that cannot be translated (a name,
+   * a code) stands as written. Null when none can.
+   */
+  private String bySentence(List<String> sentences) throws HostException {
+    StringBuilder joined = new StringBuilder();
+    boolean any = false;
+    for (String sentence : sentences) {
+      String translation = translateOne(sentence);
+      any |= translation != null;
+      joined.append(joined.length() == 0 ? "" : " ")
+          .append(translation != null ? translation : sentence);
+    }
+    return any ? joined.toString() : null;
   }
 
   /**

@@ -47,6 +47,19 @@ class SignTranslationTest {
   }
 
   @Test
+  void aParagraphIsTranslatedSentenceBySentence() throws HostException {
+    assertEquals(List.of("Children under twelve do not pay.", "Please keep the door closed."),
+        ApertiumTranslator.sentences(
+            "Children under twelve do not pay. Please keep the door closed."));
+    // The request's rule sees its sentence whole even when a block holds it after another one.
+    String paragraph = es("The museum is open every day. Please keep the door closed.");
+    assertTrue(paragraph.endsWith(". Por favor, mantenga la puerta cerrada."), paragraph);
+    // A sentence nobody can translate stands as written between translated ones.
+    String named = es("Zorbly Quaxen. Please keep the door closed.");
+    assertTrue(named.startsWith("Zorbly Quaxen. Por favor, mantenga"), named);
+  }
+
+  @Test
   void commandsToTheReaderAreInfinitivesNeverFamiliar() throws HostException {
     assertEquals("No tocar", es("Do not touch"));
     assertTrue(es("Wait here").startsWith("Esperar "), es("Wait here"));
