@@ -4,17 +4,21 @@ import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertFalse;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
+import com.quenda.tessel.desktop.Language;
 import com.quenda.tessel.desktop.engine.Rects;
+import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.scenes.CameraSequence;
 import com.quenda.tessel.desktop.scenes.CameraSequence.Pose;
 import com.quenda.tessel.desktop.scenes.Scene;
 import com.quenda.tessel.desktop.scenes.SceneLine;
 import com.quenda.tessel.desktop.scenes.Scenes;
+import com.quenda.tessel.desktop.translate.Translators;
 import com.quenda.tessel.tracking.TrackingJNI;
 import java.nio.file.Path;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.Map;
+import java.util.concurrent.atomic.AtomicInteger;
 import org.junit.jupiter.api.AfterAll;
 import org.junit.jupiter.api.BeforeAll;
 import org.junit.jupiter.api.Test;
@@ -146,5 +150,64 @@ class TrackerLossTest {
     }
     assertTrue(readAgain, "keyframes: " + result.keyframes);
     assertTrue(VideoLoopTest.worstError(camera, result, 0) <= VideoLoopTest.MAX_ERROR_PX);
+  }
+
+  @Test
+  void liveTheHostReadsALineLostPast180AgainAsSoonAsTheWorkerIsFree() throws Exception {
+    int frames = 48;
+    int firstShown = 5;
+    int readAgainBy = 40;
+    CameraSequence camera = rolling(176, 188, frames);
+    AtomicInteger ocrRuns = new AtomicInteger();
+    KeyframeWork.AfterOcr counted = frame -> ocrRuns.incrementAndGet();
+    // Frames come as fast as the loop takes them, except that frame 5 waits for the first
+    // keyframe's work and frame 40 for a second one: the line turns past 180 near frame 14.
+    FrameClock clock = new FrameClock() {
+      @Override
+      public void awaitFrame(int k) throws InterruptedException {
+        if (k == firstShown) {
+          awaitWork(ocrRuns, 1);
+        } else if (k == readAgainBy) {
+          awaitWork(ocrRuns, 2);
+        }
+      }
+
+      @Override
+      public double millisSince(int k) {
+        return 0;
+      }
+    };
+    VideoJob job = new VideoJob(new PhotoReader("eng"),
+        Translators.create(Language.of("en"), Language.of("es"), null), Language.of("es"), true,
+        counted, clock);
+    VideoResult result =
+        VideoLoopTest.run(job, VideoLoopTest.source(camera, 30), dir.resolve("live"), true);
+
+    for (int k = readAgainBy; k < frames; k++) {
+      assertTrue(
+          result.records.get(k).lines().stream().anyMatch(l -> l.text().startsWith(UPSIDE_DOWN)),
+          "frame " + k + " shows " + result.records.get(k).lines());
+    }
+    assertEquals("tracking lost", result.keyframes.get(1).get("reason"), "" + result.keyframes);
+  }
+
+  /**
+   * Waits (up to a minute) until the OCR ran {@code runs} times and the keyframe worker is idle
+   * again, its translating, erasing and catching up done.
+   */
+  static void awaitWork(AtomicInteger ocrRuns, int runs) throws InterruptedException {
+    long deadline = System.nanoTime() + 60_000_000_000L;
+    while (System.nanoTime() < deadline && (ocrRuns.get() < runs || !workerIdle())) {
+      Thread.sleep(20);
+    }
+  }
+
+  static boolean workerIdle() {
+    for (Thread thread : Thread.getAllStackTraces().keySet()) {
+      if (thread.getName().equals("keyframe-worker") && thread.getState() != Thread.State.WAITING) {
+        return false;
+      }
+    }
+    return true;
   }
 }
