@@ -49,7 +49,7 @@ public final class HostBench {
     Path dir = Files.createTempDirectory("host-bench");
     Language en = Language.of("en");
     Language es = Language.of("es");
-    PhotoReader reader = new PhotoReader(en.tesseract);
+    PhotoReader reader = new PhotoReader(en.tesseract, PhotoReader.ALL_CORES);
     Translator translator = Translators.create(en, es, null);
 
     photo(dir, reader, translator, es, runs);

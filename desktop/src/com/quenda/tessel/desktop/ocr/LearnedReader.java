@@ -40,9 +40,18 @@ public final class LearnedReader implements AutoCloseable {
    */
   public LearnedReader(Path modelDir, Script script, int detectionLongSide, boolean recognise)
       throws HostException {
+    this(modelDir, script, detectionLongSide, recognise, 1);
+  }
+
+  /**
+   * With {@code threads} threads per network run (0: as many as the machine has cores): a photo
+   * is read fastest on all of them; a live video's reading on one leaves the others to the frames.
+   */
+  public LearnedReader(Path modelDir, Script script, int detectionLongSide, boolean recognise,
+      int threads) throws HostException {
     loadLibrary();
     try {
-      handle = open(modelDir.toString(), script.ordinal(), detectionLongSide, recognise);
+      handle = open(modelDir.toString(), script.ordinal(), detectionLongSide, recognise, threads);
     } catch (ModelFileException e) {
       throw new HostException(ExitStatus.MISSING_OCR_DATA,
           "the text reader cannot load its models: " + e.getMessage()
@@ -114,8 +123,8 @@ public final class LearnedReader implements AutoCloseable {
     }
   }
 
-  static native long open(String modelDir, int script, int detectionLongSide, boolean recognise)
-      throws ModelFileException;
+  static native long open(String modelDir, int script, int detectionLongSide, boolean recognise,
+      int threads) throws ModelFileException;
 
   /** {double[] 5 per line: cx, cy, w, h, angle; byte[][] UTF-8 texts; float[] confidences}. */
   static native Object[] read(long handle, long imageAddress);

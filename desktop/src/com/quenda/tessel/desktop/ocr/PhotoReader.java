@@ -49,8 +49,11 @@ public final class PhotoReader implements AutoCloseable {
   static final double MIN_CONFIDENCE = 0.8;
   /** A margin of background around each crop, which Tesseract wants around a line. */
   static final int CROP_MARGIN = 8;
+  /** As many threads as the machine has cores. */
+  public static final int ALL_CORES = 0;
 
   private final Path modelDir;
+  private final int threads;
   private final LearnedReader learned;
   /** For pictures smaller than {@link #DETECTION_LONG_SIDE}; made when first needed. */
   private LearnedReader smallPictures;
@@ -58,9 +61,17 @@ public final class PhotoReader implements AutoCloseable {
   /** Null when the learned recogniser reads the lines. */
   private final StripRecognizer tesseract;
 
-  /** A reader for text in the language Tesseract calls {@code tesseractLanguage}. */
+  /** A reader for text in the language Tesseract calls {@code tesseractLanguage}, on one thread. */
   public PhotoReader(String tesseractLanguage) throws HostException {
-    this(tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS);
+    this(tesseractLanguage, 1);
+  }
+
+  /**
+   * With {@code threads} threads for the networks ({@link #ALL_CORES}: one per core): photos are
+   * read on all cores, a live video's keyframes on one, beside the frames being drawn.
+   */
+  public PhotoReader(String tesseractLanguage, int threads) throws HostException {
+    this(tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS, threads);
   }
 
   /**
@@ -69,6 +80,12 @@ public final class PhotoReader implements AutoCloseable {
    */
   PhotoReader(String tesseractLanguage, Path modelDir, String programPath, long timeoutMillis)
       throws HostException {
+    this(tesseractLanguage, modelDir, programPath, timeoutMillis, 1);
+  }
+
+  private PhotoReader(String tesseractLanguage, Path modelDir, String programPath,
+      long timeoutMillis, int threads) throws HostException {
+    this.threads = threads;
     switch (tesseractLanguage) {
       case "eng":
         recogniser = LATIN;
@@ -89,7 +106,7 @@ public final class PhotoReader implements AutoCloseable {
   private LearnedReader open(int detectionLongSide) throws HostException {
     return new LearnedReader(modelDir,
         recogniser.equals(CHINESE) ? LearnedReader.Script.CHINESE : LearnedReader.Script.LATIN,
-        detectionLongSide, tesseract == null);
+        detectionLongSide, tesseract == null, threads);
   }
 
   private LearnedReader readerFor(Mat rgb) throws HostException {

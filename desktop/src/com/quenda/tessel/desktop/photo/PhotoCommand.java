@@ -27,7 +27,7 @@ public final class PhotoCommand {
   public static void run(CommandLine command, PrintStream out, PrintStream err)
       throws HostException {
     List<PhotoInput> inputs = checkInputs(command.inputs);
-    try (PhotoReader reader = new PhotoReader(command.from.tesseract)) {
+    try (PhotoReader reader = new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES)) {
       run(command, inputs, reader, out, err);
     }
   }
