@@ -75,6 +75,13 @@ public final class PhotoResult {
     }
     Map<String, Object> json = new LinkedHashMap<>();
     json.put("lines", lineList);
+    json.put("blocks", blocksJson(blocks));
+    json.put("timings_ms", times.json(totalMillis));
+    return json;
+  }
+
+  /** The report's "blocks": per block its lines, source text, translation, alignment and face. */
+  public static List<Object> blocksJson(List<Typesetter.SetBlock> blocks) {
     List<Object> blockList = new ArrayList<>();
     for (Typesetter.SetBlock block : blocks) {
       Map<String, Object> b = new LinkedHashMap<>();
@@ -86,9 +93,7 @@ public final class PhotoResult {
       b.put("fits", block.translation() == null ? null : block.fits());
       blockList.add(b);
     }
-    json.put("blocks", blockList);
-    json.put("timings_ms", times.json(totalMillis));
-    return json;
+    return blockList;
   }
 
   private Mat beforeAfter() {

@@ -2,55 +2,73 @@ package com.quenda.tessel.desktop.video;
 
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
+import com.quenda.tessel.desktop.Language;
 import com.quenda.tessel.desktop.engine.Eraser;
-import com.quenda.tessel.desktop.engine.FontChoice;
 import com.quenda.tessel.desktop.engine.FrameMeans;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
-import com.quenda.tessel.desktop.photo.StrokeWeight;
 import com.quenda.tessel.desktop.translate.Translator;
+import com.quenda.tessel.desktop.typeset.Face;
+import com.quenda.tessel.desktop.typeset.Typesetter;
 import java.util.ArrayList;
-import java.util.HashMap;
 import java.util.List;
 import java.util.Locale;
-import java.util.Map;
 import org.opencv.core.Mat;
 import org.opencv.core.RotatedRect;
 
 /**
- * The slow half of the host loop, for one keyframe: read the text, translate what is new, erase
- * the translated lines. On a phone (and with --live) this runs off the frame path, on a worker
- * thread, while frames keep coming; it touches no renderer state.
+ * The slow half of the host loop, for one keyframe: read the text, typeset its translation block
+ * by block as a photo's is, erase the translated lines. On a phone (and with --live) this runs off
+ * the frame path, on a worker thread, while frames keep coming; it touches no renderer state.
  */
 final class KeyframeWork {
   /**
-   * What one keyframe gave: the lines, their translations (null: failed), one patch per translated
-   * line in order with the frame's mean colours under them, the stage times, and the weight of the
-   * translated lines' strokes (for the font).
+   * What one keyframe gave: the lines, how they were typeset (blocks translated whole, each line's
+   * share of its block's translation, where to erase and where to draw it), one patch per
+   * translated line in order with the frame's mean colours under them, and the stage times.
    */
-  record Result(int frame, List<RecognizedLine> lines, List<String> translations,
+  record Result(int frame, List<RecognizedLine> lines, Typesetter.Typeset typeset,
       Eraser.Patches patches, double[] means, double ocrMillis, double translateMillis,
-      double eraseMillis, FontChoice.Weight weight) {
-    /** Where the translated lines were read: what is erased, tracked and drawn. */
+      double eraseMillis) {
+    /** Per line the text drawn over it; null where its block was not translated. */
+    List<String> translations() {
+      List<String> texts = new ArrayList<>();
+      for (Typesetter.SetLine line : typeset.lines()) {
+        texts.add(line.text());
+      }
+      return texts;
+    }
+
+    /** The face line {@code i} is drawn in. */
+    Face face(int i) {
+      Face face = typeset.blocks().get(typeset.lines().get(i).block()).face();
+      return face == null ? Face.SANS : face;
+    }
+
+    /** Where the translated lines were read: what is tracked. */
     List<RotatedRect> translatedRects() {
-      return KeyframeWork.translatedRects(lines, translations);
+      List<RotatedRect> rects = new ArrayList<>();
+      for (int i = 0; i < lines.size(); i++) {
+        if (typeset.lines().get(i).text() != null) {
+          rects.add(lines.get(i).rect);
+        }
+      }
+      return rects;
     }
   }
 
   private final PhotoReader reader;
-  private final Translator translator;
+  private final Typesetter typesetter;
   private final AfterOcr afterOcr;
-  // Lines read again at the next keyframe are mostly the same: translate each text once.
-  private final Map<String, String> translated = new HashMap<>();
 
   /** A test's hook after each OCR run of frame {@code frame}: a slow or a held-up OCR. */
   interface AfterOcr {
     void ran(int frame) throws InterruptedException;
   }
 
-  KeyframeWork(PhotoReader reader, Translator translator, AfterOcr afterOcr) {
+  KeyframeWork(PhotoReader reader, Translator translator, Language target, AfterOcr afterOcr) {
     this.reader = reader;
-    this.translator = translator;
+    this.typesetter = new Typesetter(new RememberingTranslator(translator), target);
     this.afterOcr = afterOcr;
   }
 
@@ -74,42 +92,22 @@ final class KeyframeWork {
     }
     long read = System.nanoTime();
 
-    List<String> translations = translate(lines);
+    Typesetter.Typeset typeset = typesetter.run(rgb, lines);
     long translatedAt = System.nanoTime();
 
-    List<RotatedRect> rects = translatedRects(lines, translations);
-    Eraser.Patches patches = Eraser.erase(rgb, rects);
+    Eraser.Patches patches = Eraser.erase(rgb, eraseRects(typeset));
     double[] means = FrameMeans.under(rgb, patches.patchRects);
     long end = System.nanoTime();
-    return new Result(frame, lines, translations, patches, means, (read - start) / 1e6,
-        (translatedAt - read) / 1e6, (end - translatedAt) / 1e6,
-        FontChoice.weightOf(StrokeWeight.medianRatio(rgb, rects)));
+    return new Result(frame, lines, typeset, patches, means, (read - start) / 1e6,
+        (translatedAt - read) / 1e6, (end - translatedAt) / 1e6);
   }
 
-  private List<String> translate(List<RecognizedLine> lines) throws HostException {
-    List<String> missing = new ArrayList<>();
-    for (RecognizedLine line : lines) {
-      if (!translated.containsKey(key(line.text)) && !missing.contains(line.text)) {
-        missing.add(line.text);
-      }
-    }
-    List<String> answers = translator.translate(missing);
-    for (int i = 0; i < missing.size(); i++) {
-      translated.put(key(missing.get(i)), answers.get(i));
-    }
-    List<String> translations = new ArrayList<>();
-    for (RecognizedLine line : lines) {
-      translations.add(translated.get(key(line.text)));
-    }
-    return translations;
-  }
-
-  private static List<RotatedRect> translatedRects(
-      List<RecognizedLine> lines, List<String> translations) {
+  /** What is erased around the translated lines: their whole ink, first and last letters too. */
+  private static List<RotatedRect> eraseRects(Typesetter.Typeset typeset) {
     List<RotatedRect> rects = new ArrayList<>();
-    for (int i = 0; i < lines.size(); i++) {
-      if (translations.get(i) != null) {
-        rects.add(lines.get(i).rect);
+    for (Typesetter.SetLine line : typeset.lines()) {
+      if (line.text() != null) {
+        rects.add(line.eraseRect());
       }
     }
     return rects;

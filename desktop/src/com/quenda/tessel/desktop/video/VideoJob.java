@@ -5,16 +5,17 @@ import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
 import com.quenda.tessel.desktop.Progress;
 import com.quenda.tessel.desktop.engine.Eraser;
-import com.quenda.tessel.desktop.engine.FontChoice;
 import com.quenda.tessel.desktop.engine.FrameMeans;
 import com.quenda.tessel.desktop.engine.OverlayDrawer;
 import com.quenda.tessel.desktop.engine.Overlays;
 import com.quenda.tessel.desktop.engine.Rects;
-import com.quenda.tessel.desktop.engine.TextPlacement;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.photo.LineResult;
+import com.quenda.tessel.desktop.photo.PhotoResult;
 import com.quenda.tessel.desktop.translate.Translator;
+import com.quenda.tessel.desktop.typeset.Face;
+import com.quenda.tessel.desktop.typeset.Typesetter;
 import com.quenda.tessel.tracking.TrackingJNI;
 import java.util.ArrayList;
 import java.util.Arrays;
@@ -125,7 +126,7 @@ public final class VideoJob {
    */
   VideoJob(PhotoReader reader, Translator translator, Language target, boolean live,
       KeyframeWork.AfterOcr afterOcr, FrameClock clock) {
-    this.work = new KeyframeWork(reader, translator, afterOcr);
+    this.work = new KeyframeWork(reader, translator, target, afterOcr);
     this.target = target;
     this.live = live;
     this.clock = clock;
@@ -156,13 +157,13 @@ public final class VideoJob {
     private final FrameClock arrivals;
 
     private OverlayDrawer drawer;
+    private Face boundFace;
     private long tracker;
     private Mat keyframeRgba;
     private List<ShownLine> shown = new ArrayList<>();
     private long nextId;
     private long nextPatchId;
     private int lastKeyframe = Integer.MIN_VALUE;
-    private boolean fontChosen;
     private List<Object> gainsKey;
     private double[] gainsValue;
     private final Mat rgbaFrame = new Mat();
@@ -452,11 +453,11 @@ public final class VideoJob {
       List<ShownLine> next = new ArrayList<>();
       for (int i = 0, p = 0; i < result.lines().size(); i++) {
         RecognizedLine line = result.lines().get(i);
-        String translation = result.translations().get(i);
-        if (translation == null) {
+        Typesetter.SetLine set = result.typeset().lines().get(i);
+        if (set.text() == null) {
           continue;
         }
-        ShownLine shownLine = new ShownLine(idFor(line), result.frame(), line, translation);
+        ShownLine shownLine = new ShownLine(idFor(line), result.frame(), line, set, result.face(i));
         shownLine.replacePatch(result.patches().overlays.get(p), nextPatchId++,
             result.patches().colors[p], line.rect,
             Arrays.copyOfRange(result.means(), 3 * p, 3 * p + 3));
@@ -477,7 +478,6 @@ public final class VideoJob {
       }
       // The reference for the view-change rule: the view the overlays were placed in.
       keyframeRgba = rgba(frame).clone();
-      chooseFont(frame, result.weight());
     }
 
     /** A tracker of the result's translated lines on the frame they were read in; 0 for none. */
@@ -501,14 +501,6 @@ public final class VideoJob {
         }
       }
       return nextId++;
-    }
-
-    private void chooseFont(Mat frame, FontChoice.Weight weight) throws HostException {
-      if (fontChosen || shown.isEmpty()) {
-        return;
-      }
-      drawer(frame).setLanguage(target, weight);
-      fontChosen = true;
     }
 
     private boolean anyNeedsErasing(Mat frame) {
@@ -564,49 +556,94 @@ public final class VideoJob {
       long start = System.nanoTime();
       List<RotatedRect> rects = new ArrayList<>();
       for (ShownLine line : stale) {
-        rects.add(line.rect);
+        rects.add(line.eraseRect());
       }
       Eraser.Patches patches = Eraser.erase(frame, rects);
       double[] means = FrameMeans.under(frame, patches.patchRects);
       for (int i = 0; i < stale.size(); i++) {
-        stale.get(i).replacePatch(patches.overlays.get(i), nextPatchId++, patches.colors[i],
-            rects.get(i), Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
+        ShownLine line = stale.get(i);
+        line.replacePatch(patches.overlays.get(i), nextPatchId++, patches.colors[i], line.rect,
+            Arrays.copyOfRange(means, 3 * i, 3 * i + 3));
       }
       timings.add("erase again", (System.nanoTime() - start) / 1e6);
     }
 
-    /** Step 4: the frame with every visible line drawn over it; the frame itself when none. */
+    /**
+     * Step 4: the frame with every visible line drawn over it, its translation in the rectangle
+     * set at the keyframe carried along with the tracked line; the frame itself when none.
+     */
     private Mat draw(Mat frame, int k) throws HostException {
       List<ShownLine> visible = visible();
       List<FrameRecord.Drawn> drawnLines = new ArrayList<>();
       for (ShownLine line : visible) {
-        drawnLines.add(new FrameRecord.Drawn(
-            line.id, line.read.text, line.translation, line.rect, line.keyframe, line.read.rect));
+        drawnLines.add(new FrameRecord.Drawn(line.id, line.read.text, line.translation, line.rect,
+            line.keyframe, line.read.rect, line.textRect(), line.face));
       }
       records.add(new FrameRecord(k, drawnLines));
       if (visible.isEmpty()) {
         return frame;
       }
       long start = System.nanoTime();
-      int n = visible.size();
+      Mat drawn = drawByFace(frame, visible);
+      timings.add("draw", (System.nanoTime() - start) / 1e6);
+      return drawn;
+    }
+
+    /**
+     * Draws {@code visible} one pass per face, as a photo is: the renderer builds a line's text in
+     * the font bound when it first meets the line's patch id and keeps it, so a keyframe of one
+     * face (the usual case) costs one pass and one font binding per keyframe, and each further
+     * face one more pass over what the passes before drew.
+     */
+    private Mat drawByFace(Mat frame, List<ShownLine> visible) throws HostException {
+      Map<Face, List<ShownLine>> byFace = new LinkedHashMap<>();
+      for (ShownLine line : visible) {
+        byFace.computeIfAbsent(line.face, f -> new ArrayList<>()).add(line);
+      }
+      double[] gains = gains(frame, visible);
+      Mat drawn = frame;
+      for (Map.Entry<Face, List<ShownLine>> pass : byFace.entrySet()) {
+        List<ShownLine> lines = pass.getValue();
+        double[] passGains = new double[3 * lines.size()];
+        for (int j = 0; j < lines.size(); j++) {
+          int i = visible.indexOf(lines.get(j));
+          System.arraycopy(gains, 3 * i, passGains, 3 * j, 3);
+        }
+        bindFace(frame, pass.getKey());
+        Mat next = drawer(frame).draw(rgba(drawn), overlays(lines, passGains));
+        if (drawn != frame) {
+          drawn.release();
+        }
+        drawn = next;
+      }
+      return drawn;
+    }
+
+    private Overlays overlays(List<ShownLine> lines, double[] gains) {
+      int n = lines.size();
       String[] texts = new String[n];
       long[] ids = new long[n];
       long[] patches = new long[n];
       int[] colors = new int[n];
       List<RotatedRect> textRects = new ArrayList<>();
       for (int i = 0; i < n; i++) {
-        ShownLine line = visible.get(i);
+        ShownLine line = lines.get(i);
         texts[i] = line.translation;
         ids[i] = line.patchId;
         patches[i] = line.patch.getNativeObjAddr();
         colors[i] = line.color;
-        textRects.add(TextPlacement.textRect(line.rect, line.read.text, line.translation));
+        textRects.add(line.textRect());
       }
-      Mat drawn = drawer(frame).draw(rgba(frame),
-          new Overlays(texts, patchRects(visible), Rects.pack(textRects), ids, patches, colors,
-              gains(frame, visible)));
-      timings.add("draw", (System.nanoTime() - start) / 1e6);
-      return drawn;
+      return new Overlays(
+          texts, patchRects(lines), Rects.pack(textRects), ids, patches, colors, gains);
+    }
+
+    /** Binds {@code face} for the lines drawn next, when another face is bound. */
+    private void bindFace(Mat frame, Face face) throws HostException {
+      if (face != boundFace) {
+        drawer(frame).setLanguage(target, face);
+        boundFace = face;
+      }
     }
 
     private List<ShownLine> visible() {
@@ -619,10 +656,11 @@ public final class VideoJob {
       return visible;
     }
 
+    /** Where each line's patch goes: around what was erased, carried along with the line. */
     private double[] patchRects(List<ShownLine> lines) {
       List<RotatedRect> rects = new ArrayList<>();
       for (ShownLine line : lines) {
-        rects.add(line.rect);
+        rects.add(line.eraseRect());
       }
       return Eraser.enlarged(Rects.pack(rects));
     }
@@ -638,15 +676,19 @@ public final class VideoJob {
     private Map<String, Object> keyframeJson(KeyframeWork.Result result, String reason) {
       List<Object> lines = new ArrayList<>();
       for (int i = 0, p = 0; i < result.lines().size(); i++) {
-        boolean translated = result.translations().get(i) != null;
-        lines.add(new LineResult(result.lines().get(i), result.translations().get(i),
-            translated ? result.patches().colors[p++] : 0)
+        Typesetter.SetLine set = result.typeset().lines().get(i);
+        Typesetter.SetBlock block = result.typeset().blocks().get(set.block());
+        boolean translated = set.text() != null;
+        lines.add(new LineResult(result.lines().get(i), set.text(),
+            translated ? result.patches().colors[p++] : 0, set.block(), set.sizeRatio(),
+            block.block().align, block.face())
                       .json());
       }
       Map<String, Object> json = new LinkedHashMap<>();
       json.put("frame", result.frame());
       json.put("reason", reason);
       json.put("lines", lines);
+      json.put("blocks", PhotoResult.blocksJson(result.typeset().blocks()));
       return json;
     }
 

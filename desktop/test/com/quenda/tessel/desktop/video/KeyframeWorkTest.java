@@ -4,6 +4,7 @@ import static org.junit.jupiter.api.Assertions.assertEquals;
 import static org.junit.jupiter.api.Assertions.assertNull;
 import static org.junit.jupiter.api.Assertions.assertTrue;
 
+import com.quenda.tessel.desktop.Language;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.scenes.Scene;
@@ -49,7 +50,8 @@ class KeyframeWorkTest {
     Scene station = Scenes.bundled("station");
     Signs translator = new Signs();
     List<Integer> ocrFrames = new ArrayList<>();
-    KeyframeWork work = new KeyframeWork(new PhotoReader("eng"), translator, ocrFrames::add);
+    KeyframeWork work =
+        new KeyframeWork(new PhotoReader("eng"), translator, Language.of("es"), ocrFrames::add);
     Mat frame = station.rgb;
 
     KeyframeWork.Result first = work.run(frame, 0);
