@@ -5,7 +5,9 @@
 #include <stdexcept>
 
 #include <onnxruntime_cxx_api.h>
+#include <onnxruntime_session_options_config_keys.h>
 
+#include "float_mode.h"
 #include "textreader/text_reader.h"
 
 namespace textreader {
@@ -37,11 +39,16 @@ struct OnnxModel::Session {
 OnnxModel::OnnxModel(const std::string& path, int input_rank, int threads)
     : path_(path), session_(std::make_unique<Session>()) {
   CheckReadable(path);
+  // The runtime sets its denormal handling on the thread that makes the
+  // session too: that thread is the caller's and keeps its own.
+  const KeepFloatMode keep_callers_mode;
   try {
     Ort::SessionOptions options;
     options.SetIntraOpNumThreads(threads);
     options.SetInterOpNumThreads(1);
     options.SetGraphOptimizationLevel(GraphOptimizationLevel::ORT_ENABLE_ALL);
+    // For the runtime's own threads; Run sees to the calling thread.
+    options.AddConfigEntry(kOrtSessionOptionsConfigSetDenormalAsZero, "1");
     session_->session = Ort::Session(SharedEnvironment(), path.c_str(), options);
   } catch (const Ort::Exception& e) {
     throw ModelError("model file does not load: " + path + ": " + e.what());
@@ -60,6 +67,7 @@ OnnxModel::OnnxModel(const std::string& path, int input_rank, int threads)
 OnnxModel::~OnnxModel() = default;
 
 Tensor OnnxModel::Run(const Tensor& input) const {
+  const FlushDenormals flush;  // the calling thread does part of the work
   try {
     const Ort::MemoryInfo memory = Ort::MemoryInfo::CreateCpu(OrtArenaAllocator, OrtMemTypeDefault);
     // The runtime only reads the input; its C API takes a mutable pointer.

@@ -30,12 +30,12 @@ class Recogniser {
   // Lines are padded to at least `min_width`.
   Recogniser(const std::string& path, Alphabet alphabet, int threads, int min_width);
 
-  // Reads crops `kRecogniserHeight` pixels high (8-bit R G B (A)), batched by
-  // width; one reading per crop, in order.
+  // Reads crops `kRecogniserHeight` pixels high (8-bit R G B (A)), one by
+  // one; one reading per crop, in order.
   std::vector<Reading> Read(const std::vector<cv::Mat>& crops) const;
 
  private:
-  std::vector<Reading> ReadBatch(const std::vector<const cv::Mat*>& batch) const;
+  Reading ReadOne(const cv::Mat& crop) const;
 
   OnnxModel model_;
   Alphabet alphabet_;

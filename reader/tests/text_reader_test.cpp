@@ -1,6 +1,7 @@
 // The whole reader with the installed models: rendered lines at every
 // turn, and real photographs.
 #include <cmath>
+#include <limits>
 #include <map>
 #include <memory>
 
@@ -167,6 +168,24 @@ TEST(TextReader, WithoutRecognitionGivesTheLinesWithoutText) {
   EXPECT_EQ(lines[0].text, "");
   EXPECT_EQ(lines[0].confidence, 0.0F);
   EXPECT_GT(std::abs(lines[0].rect.angle), 175.0F);  // classified all the same
+}
+
+// The reader flushes denormal floats to zero while its networks run, which
+// makes them several times faster; the thread that calls it (a JVM's, say)
+// must get its own float handling back, from making a reader and from reading.
+TEST(TextReader, LeavesTheCallingThreadsFloatHandlingAsItWas) {
+  const auto denormal_survives = [] {
+    volatile float tiny = std::numeric_limits<float>::min();
+    tiny = tiny / 4.0F;
+    return tiny > 0.0F;
+  };
+  ASSERT_TRUE(denormal_survives());
+  ReaderOptions options;
+  options.model_dir = TEXTREADER_MODEL_DIR;
+  const TextReader reader(options);
+  EXPECT_TRUE(denormal_survives()) << "after making a reader";
+  EXPECT_EQ(reader.Read(RenderedText("LOOK HERE", {400, 200}, {200, 100}, 1.6, 0)).size(), 1U);
+  EXPECT_TRUE(denormal_survives()) << "after reading";
 }
 
 }  // namespace
