@@ -131,7 +131,7 @@ extern "C" {
 
 JNIEXPORT jlong JNICALL Java_com_quenda_tessel_desktop_ocr_LearnedReader_open(
     JNIEnv* env, jclass, jstring model_dir, jint script, jint detection_long_side,
-    jboolean recognise, jint threads) {
+    jint scene_long_side, jboolean recognise, jint threads) {
   return Guarded(env, jlong{0}, [&]() -> jlong {
     if (model_dir == nullptr) {
       Throw(env, kIllegalArgument, "no model folder given");
@@ -146,6 +146,7 @@ JNIEXPORT jlong JNICALL Java_com_quenda_tessel_desktop_ocr_LearnedReader_open(
     env->ReleaseStringUTFChars(model_dir, chars);
     options.script = script == 1 ? textreader::Script::kChinese : textreader::Script::kLatin;
     options.detection_long_side = detection_long_side;
+    options.scene_long_side = scene_long_side;
     options.recognise = recognise == JNI_TRUE;
     options.threads = threads;
     auto* reader = new textreader::TextReader(options);

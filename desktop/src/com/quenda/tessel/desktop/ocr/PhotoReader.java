@@ -54,6 +54,8 @@ public final class PhotoReader implements AutoCloseable {
 
   private final Path modelDir;
   private final int threads;
+  /** Whether large pictures are looked at closer first, for a scene's small text. */
+  private final boolean sceneDetail;
   private final LearnedReader learned;
   /** For pictures smaller than {@link #DETECTION_LONG_SIDE}; made when first needed. */
   private LearnedReader smallPictures;
@@ -71,7 +73,17 @@ public final class PhotoReader implements AutoCloseable {
    * read on all cores, a live video's keyframes on one, beside the frames being drawn.
    */
   public PhotoReader(String tesseractLanguage, int threads) throws HostException {
-    this(tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS, threads);
+    this(tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS, threads, true);
+  }
+
+  /**
+   * A reader for a live video's keyframes: on one thread, beside the frames being drawn, and
+   * looking at each frame once at {@link #DETECTION_LONG_SIDE}. The closer look for a scene's small
+   * text doubles the detector's time on a 720p frame, and the live overlay waits for it.
+   */
+  public static PhotoReader forLiveVideo(String tesseractLanguage) throws HostException {
+    return new PhotoReader(
+        tesseractLanguage, null, TesseractProgram.PROGRAM, DEFAULT_TIMEOUT_MILLIS, 1, false);
   }
 
   /**
@@ -80,12 +92,13 @@ public final class PhotoReader implements AutoCloseable {
    */
   PhotoReader(String tesseractLanguage, Path modelDir, String programPath, long timeoutMillis)
       throws HostException {
-    this(tesseractLanguage, modelDir, programPath, timeoutMillis, 1);
+    this(tesseractLanguage, modelDir, programPath, timeoutMillis, 1, true);
   }
 
   private PhotoReader(String tesseractLanguage, Path modelDir, String programPath,
-      long timeoutMillis, int threads) throws HostException {
+      long timeoutMillis, int threads, boolean sceneDetail) throws HostException {
     this.threads = threads;
+    this.sceneDetail = sceneDetail;
     switch (tesseractLanguage) {
       case "eng":
         recogniser = LATIN;
@@ -106,7 +119,8 @@ public final class PhotoReader implements AutoCloseable {
   private LearnedReader open(int detectionLongSide) throws HostException {
     return new LearnedReader(modelDir,
         recogniser.equals(CHINESE) ? LearnedReader.Script.CHINESE : LearnedReader.Script.LATIN,
-        detectionLongSide, tesseract == null, threads);
+        detectionLongSide, sceneDetail ? LearnedReader.SCENE_LONG_SIDE : 0, tesseract == null,
+        threads);
   }
 
   private LearnedReader readerFor(Mat rgb) throws HostException {

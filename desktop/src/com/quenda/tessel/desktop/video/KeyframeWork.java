@@ -13,8 +13,13 @@ import com.quenda.tessel.desktop.typeset.Typesetter;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.Locale;
+import org.opencv.core.CvType;
 import org.opencv.core.Mat;
+import org.opencv.core.Point;
 import org.opencv.core.RotatedRect;
+import org.opencv.core.Scalar;
+import org.opencv.core.Size;
+import org.opencv.imgproc.Imgproc;
 
 /**
  * The slow half of the host loop, for one keyframe: read the text, typeset its translation block
@@ -57,6 +62,8 @@ final class KeyframeWork {
     }
   }
 
+  private static final Size WARM_UP_SIZE = new Size(320, 128);
+
   private final PhotoReader reader;
   private final Typesetter typesetter;
   private final AfterOcr afterOcr;
@@ -81,11 +88,33 @@ final class KeyframeWork {
     };
   }
 
-  synchronized Result run(Mat rgb, int frame) throws HostException {
+  /**
+   * Does a keyframe's work once on a small sign before the first frame, as an app gets ready
+   * before it opens the camera. A first keyframe otherwise waits some 0.5 s longer than the next
+   * ones: the translator's programs load their dictionaries, the fonts load, the eraser and the
+   * host's code run for the first time.
+   */
+  void warmUp() throws HostException {
+    Mat sign = new Mat(WARM_UP_SIZE, CvType.CV_8UC3, new Scalar(255, 255, 255));
+    try {
+      Imgproc.putText(sign, "OPEN", new Point(20, 90), Imgproc.FONT_HERSHEY_SIMPLEX, 2.5,
+          new Scalar(0, 0, 0), 6);
+      // Not a keyframe: the tests' hook after each keyframe's OCR is not called.
+      work(sign, -1, frame -> {}).patches().release();
+    } finally {
+      sign.release();
+    }
+  }
+
+  Result run(Mat rgb, int frame) throws HostException {
+    return work(rgb, frame, afterOcr);
+  }
+
+  private synchronized Result work(Mat rgb, int frame, AfterOcr hook) throws HostException {
     long start = System.nanoTime();
     List<RecognizedLine> lines = reader.read(rgb);
     try {
-      afterOcr.ran(frame);
+      hook.ran(frame);
     } catch (InterruptedException e) {
       Thread.currentThread().interrupt();
       throw new HostException(ExitStatus.INTERNAL, "interrupted while reading the text");

@@ -23,10 +23,14 @@ public final class VideoCommand {
   public static VideoResult run(CommandLine command, PrintStream out, PrintStream err)
       throws HostException {
     try (FrameSource source = FrameSources.open(command.inputs.get(0))) {
-      VideoJob job = new VideoJob(
-          new PhotoReader(command.from.tesseract, command.live ? 1 : PhotoReader.ALL_CORES),
-          Translators.create(command.from, command.to, command.translations), command.to,
-          command.live, Long.getLong(OCR_DELAY_PROPERTY, 0));
+      // Offline, a keyframe holds its frame up: read on every core. Live, it is read beside the
+      // frames being drawn.
+      PhotoReader reader = command.live
+          ? PhotoReader.forLiveVideo(command.from.tesseract)
+          : new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES);
+      VideoJob job =
+          new VideoJob(reader, Translators.create(command.from, command.to, command.translations),
+              command.to, command.live, Long.getLong(OCR_DELAY_PROPERTY, 0));
       return run(job, source, command, out, err);
     }
   }

@@ -135,6 +135,9 @@ public final class VideoJob {
   /** Runs the whole source through; {@code sink} receives every output frame. */
   public VideoResult run(FrameSource source, VideoSink sink, Progress progress)
       throws HostException {
+    if (live) {
+      work.warmUp();
+    }
     Loop loop =
         new Loop(source, sink, progress, clock != null ? clock : FrameClock.realTime(source.fps()));
     try {

@@ -164,6 +164,9 @@ class LearnedReaderTest {
   void optionsOutOfRangeAreRefused() {
     assertThrows(IllegalArgumentException.class,
         () -> new LearnedReader(models, LearnedReader.Script.LATIN, 0, true));
+    IllegalArgumentException scene = assertThrows(IllegalArgumentException.class,
+        () -> new LearnedReader(models, LearnedReader.Script.LATIN, 960, 5, true, 1));
+    assertTrue(scene.getMessage().contains("scene_long_side"), scene.getMessage());
     // And a rectangle somewhere off the picture crops to something, not a crash.
     Mat rgb = new Mat(50, 50, CvType.CV_8UC3, new Scalar(255, 255, 255));
     Mat crop = LearnedReader.uprightCrop(

@@ -59,6 +59,25 @@ class PhotoReaderTest {
     assertTrue(found >= 0.9 * words, found + " of " + words + " words found");
   }
 
+  /** The live video's reader looks at a 720p frame once, without the closer scene pass. */
+  @Test
+  void theLiveVideoReaderReadsCameraFramesSignsToo() throws HostException {
+    int words = 0;
+    int found = 0;
+    try (PhotoReader live = PhotoReader.forLiveVideo("eng")) {
+      for (String name : List.of("street", "station", "shop")) {
+        Scene scene = Scenes.bundled(name);
+        assertEquals(1280, scene.rgb.cols());
+        for (LineMatch m : LineMatch.match(scene.lines, live.read(scene.rgb))) {
+          words += m.truthWords();
+          found += m.wordsFound();
+        }
+        scene.release();
+      }
+    }
+    assertTrue(found >= 0.9 * words, found + " of " + words + " words found");
+  }
+
   @Test
   void readsLinesWithTheLearnedRecogniserAndSaysSo() throws HostException {
     Mat rgb = TextPictures.lines(900, 260, "Tickets are sold at the counter", "Platform 4");

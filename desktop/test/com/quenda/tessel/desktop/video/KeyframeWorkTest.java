@@ -44,6 +44,19 @@ class KeyframeWorkTest {
     }
   }
 
+  /** Before a live video's first frame: a sign read, translated and erased, not a keyframe. */
+  @Test
+  void warmingUpTranslatesASignWithoutCountingAsAKeyframe() throws Exception {
+    System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
+    Signs translator = new Signs();
+    List<Integer> ocrFrames = new ArrayList<>();
+    KeyframeWork work =
+        new KeyframeWork(new PhotoReader("eng"), translator, Language.of("es"), ocrFrames::add);
+    work.warmUp();
+    assertEquals(List.of(), ocrFrames);
+    assertEquals(List.of(List.of("OPEN")), translator.asked);
+  }
+
   @Test
   void anUntranslatedLineIsLeftAsItStandsAndTextsAreTranslatedOnce() throws Exception {
     System.loadLibrary(Core.NATIVE_LIBRARY_NAME);
