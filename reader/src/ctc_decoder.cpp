@@ -2,42 +2,102 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <tuple>
+#include <utility>
+#include <vector>
 
 namespace textreader {
+namespace {
+
+// A gap between two characters where the space classes reach this
+// probability at some step is a word boundary, though the blank won every
+// step of it. The recognisers often read widely spaced capitals ("BREAK
+// GLASS") with a space of 0.3 to 0.5 under the blank, and the letters of a
+// word with next to none.
+constexpr float kSpaceInGap = 0.25F;
+
+// Class probabilities of one step, with every class of one character (the
+// English recogniser has two spaces) counted as one.
+class Step {
+ public:
+  Step(const float* row, const std::vector<int>& spaces) : row_(row) {
+    for (const int c : spaces)
+      space_ += row[c];
+  }
+  float space() const { return space_; }
+  // The winning class, and its probability.
+  std::pair<int, float> Best(int classes, const std::vector<int>& spaces) const {
+    const int best = static_cast<int>(std::max_element(row_, row_ + classes) - row_);
+    if (!spaces.empty() && space_ > row_[best])
+      return {spaces.front(), space_};
+    return {best, row_[best]};
+  }
+
+ private:
+  const float* row_;
+  float space_ = 0.0F;
+};
+
+bool IsSpace(const DecodedCharacter& c) {
+  return c.text == " ";
+}
+
+}  // namespace
 
 Decoded DecodeCtc(const float* probabilities, int steps, const Alphabet& alphabet) {
   const int classes = static_cast<int>(alphabet.size());
+  std::vector<int> spaces;
+  for (int c = 1; c < classes; ++c) {
+    if (alphabet[c] == " ")
+      spaces.push_back(c);
+  }
   std::vector<DecodedCharacter> characters;
-  std::vector<float> scores;
+  std::vector<float> scores;  // per character; none for a space found in a gap
   int previous = 0;
+  // The most likely space since the last character, and where.
+  float gap_space = 0.0F;
+  int gap_step = 0;
   for (int t = 0; t < steps; ++t) {
-    const float* row = probabilities + static_cast<std::ptrdiff_t>(t) * classes;
-    const int best = static_cast<int>(std::max_element(row, row + classes) - row);
-    if (best != 0 && best == previous) {
+    const Step step(probabilities + static_cast<std::ptrdiff_t>(t) * classes, spaces);
+    const auto [best, p] = step.Best(classes, spaces);
+    if (best == 0) {
+      if (step.space() > gap_space)
+        std::tie(gap_space, gap_step) = std::make_pair(step.space(), t);
+    } else if (best == previous) {
       characters.back().last_step = t;
-    } else if (best != 0) {
+    } else {
+      const bool space = !spaces.empty() && best == spaces.front();
+      if (!space && gap_space >= kSpaceInGap && !characters.empty() &&
+          !IsSpace(characters.back())) {
+        characters.push_back({" ", gap_step, gap_step});
+        scores.push_back(-1.0F);
+      }
       characters.push_back({alphabet[best], t, t});
-      scores.push_back(row[best]);
+      scores.push_back(p);
+      gap_space = 0.0F;
     }
     previous = best;
   }
   // Spaces at the ends separate nothing.
-  const auto is_space = [](const DecodedCharacter& c) { return c.text == " "; };
   std::size_t begin = 0;
   std::size_t end = characters.size();
-  while (begin < end && is_space(characters[begin]))
+  while (begin < end && IsSpace(characters[begin]))
     ++begin;
-  while (end > begin && is_space(characters[end - 1]))
+  while (end > begin && IsSpace(characters[end - 1]))
     --end;
   Decoded decoded;
   float sum = 0.0F;
+  int scored = 0;
   for (std::size_t i = begin; i < end; ++i) {
     decoded.text += characters[i].text;
     decoded.characters.push_back(characters[i]);
-    sum += scores[i];
+    if (scores[i] >= 0.0F) {
+      sum += scores[i];
+      ++scored;
+    }
   }
-  if (end > begin)
-    decoded.confidence = sum / static_cast<float>(end - begin);
+  if (scored > 0)
+    decoded.confidence = sum / static_cast<float>(scored);
   return decoded;
 }
 

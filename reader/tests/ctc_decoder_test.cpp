@@ -52,6 +52,51 @@ TEST(DecodeCtc, ConfidenceIsTheMeanOfTheEmittedCharacters) {
   EXPECT_EQ(Decode({}).text, "");
 }
 
+// Blank wins the step, with `space` on the space class.
+std::vector<float> BlankStep(float space) {
+  std::vector<float> step(kAlphabet.size(), 0.0F);
+  step[0] = 1.0F - space;
+  step[3] = space;
+  return step;
+}
+
+TEST(DecodeCtc, AGapWhereASpaceIsLikelyIsAWordBoundary) {
+  const auto read = [](float space) {
+    std::vector<float> p = Steps({1, 1});
+    const std::vector<float> gap = BlankStep(space);
+    p.insert(p.end(), gap.begin(), gap.end());
+    p.insert(p.end(), gap.begin(), gap.end());
+    const std::vector<float> b = Steps({2});
+    p.insert(p.end(), b.begin(), b.end());
+    return Decode(p);
+  };
+  const Decoded spaced = read(0.3F);
+  EXPECT_EQ(spaced.text, "a b");
+  // The boundary is a judgement on the gap, not a character read: the line's
+  // confidence is that of its letters.
+  EXPECT_NEAR(spaced.confidence, 0.9F, 1e-6);
+  ASSERT_EQ(spaced.characters.size(), 3U);
+  EXPECT_EQ(spaced.characters[1].first_step, 2);
+  // The letters of a word have next to no space between them.
+  EXPECT_EQ(read(0.05F).text, "ab");
+  // Nor is a gap before the first character or after the last a space.
+  std::vector<float> ends = BlankStep(0.4F);
+  const std::vector<float> a = Steps({1});
+  ends.insert(ends.end(), a.begin(), a.end());
+  const std::vector<float> tail = BlankStep(0.4F);
+  ends.insert(ends.end(), tail.begin(), tail.end());
+  EXPECT_EQ(Decode(ends).text, "a");
+}
+
+TEST(DecodeCtc, ClassesOfOneCharacterCountAsOne) {
+  // Two space classes, as the English recogniser has: together they beat
+  // the blank, though each alone does not.
+  const Alphabet two_spaces{"", "a", " ", " "};
+  const std::vector<float> p{0.1F, 0.9F, 0.0F,  0.0F,  0.4F, 0.0F,
+                             0.3F, 0.3F, 0.05F, 0.95F, 0.0F, 0.0F};
+  EXPECT_EQ(DecodeCtc(p.data(), 3, two_spaces).text, "a a");
+}
+
 TEST(CharacterBoxes, SplitTheLineBetweenCharacterCentresAndSkipSpaces) {
   Reading reading;
   // 20 steps over the input, of which the crop fills the first half.
