@@ -28,7 +28,8 @@ class Step {
   // The winning class, and its probability.
   std::pair<int, float> Best(int classes, const std::vector<int>& spaces) const {
     const int best = static_cast<int>(std::max_element(row_, row_ + classes) - row_);
-    if (!spaces.empty() && space_ > row_[best])
+    const bool is_space = std::find(spaces.begin(), spaces.end(), best) != spaces.end();
+    if (is_space || (!spaces.empty() && space_ > row_[best]))
       return {spaces.front(), space_};
     return {best, row_[best]};
   }
@@ -60,13 +61,14 @@ Decoded DecodeCtc(const float* probabilities, int steps, const Alphabet& alphabe
   for (int t = 0; t < steps; ++t) {
     const Step step(probabilities + static_cast<std::ptrdiff_t>(t) * classes, spaces);
     const auto [best, p] = step.Best(classes, spaces);
+    const bool space = !spaces.empty() && best == spaces.front();
     if (best == 0) {
       if (step.space() > gap_space)
         std::tie(gap_space, gap_step) = std::make_pair(step.space(), t);
-    } else if (best == previous) {
+    } else if (best == previous || (space && !characters.empty() && IsSpace(characters.back()))) {
+      // The character's run goes on; a space is one, however many runs it takes.
       characters.back().last_step = t;
     } else {
-      const bool space = !spaces.empty() && best == spaces.front();
       if (!space && gap_space >= kSpaceInGap && !characters.empty() &&
           !IsSpace(characters.back())) {
         characters.push_back({" ", gap_step, gap_step});
