@@ -8,6 +8,12 @@ interface FrameClock {
   /** Milliseconds since frame {@code k} arrived. */
   double millisSince(int k);
 
+  /**
+   * Told when the worker has finished live keyframe {@code k} (read, translated, erased, caught
+   * up), so that the frame loop can take it over: a test's clock paces its frames by it.
+   */
+  default void keyframeDone(int k) {}
+
   /** Frame k arrives k / fps seconds after the first call, as a camera delivers them. */
   static FrameClock realTime(double fps) {
     return new FrameClock() {

@@ -27,6 +27,7 @@ import java.util.concurrent.ExecutionException;
 import java.util.concurrent.ExecutorService;
 import java.util.concurrent.Executors;
 import java.util.concurrent.Future;
+import java.util.concurrent.FutureTask;
 import java.util.concurrent.LinkedBlockingQueue;
 import org.opencv.core.Mat;
 import org.opencv.core.RotatedRect;
@@ -353,13 +354,20 @@ public final class VideoJob {
       lastKeyframe = k;
       LiveKeyframe keyframe = new LiveKeyframe(reason);
       Mat copy = frame.clone();
-      keyframe.result = worker.submit(() -> {
+      FutureTask<CaughtUp> task = new FutureTask<>(() -> {
         try {
           return catchUpOnWorker(work.run(copy, k), copy, keyframe.framesSince);
         } finally {
           copy.release();
         }
-      });
+      }) {
+        @Override
+        protected void done() {
+          arrivals.keyframeDone(k); // the result can be taken from here on
+        }
+      };
+      worker.execute(task);
+      keyframe.result = task;
       working = keyframe;
     }
 
