@@ -20,22 +20,25 @@ constexpr float kSpaceInGap = 0.25F;
 // English recogniser has two spaces) counted as one.
 class Step {
  public:
-  Step(const float* row, const std::vector<int>& spaces) : row_(row) {
+  Step(const float* row, int classes, const std::vector<int>& spaces)
+      : row_(row), classes_(classes), spaces_(spaces) {
     for (const int c : spaces)
       space_ += row[c];
   }
   float space() const { return space_; }
-  // The winning class, and its probability.
-  std::pair<int, float> Best(int classes, const std::vector<int>& spaces) const {
-    const int best = static_cast<int>(std::max_element(row_, row_ + classes) - row_);
-    const bool is_space = std::find(spaces.begin(), spaces.end(), best) != spaces.end();
-    if (is_space || (!spaces.empty() && space_ > row_[best]))
-      return {spaces.front(), space_};
+  // The winning class (a space as the first space class), and its probability.
+  std::pair<int, float> Best() const {
+    const int best = static_cast<int>(std::max_element(row_, row_ + classes_) - row_);
+    const bool is_space = std::find(spaces_.begin(), spaces_.end(), best) != spaces_.end();
+    if (is_space || (!spaces_.empty() && space_ > row_[best]))
+      return {spaces_.front(), space_};
     return {best, row_[best]};
   }
 
  private:
   const float* row_;
+  int classes_;
+  const std::vector<int>& spaces_;
   float space_ = 0.0F;
 };
 
@@ -59,8 +62,8 @@ Decoded DecodeCtc(const float* probabilities, int steps, const Alphabet& alphabe
   float gap_space = 0.0F;
   int gap_step = 0;
   for (int t = 0; t < steps; ++t) {
-    const Step step(probabilities + static_cast<std::ptrdiff_t>(t) * classes, spaces);
-    const auto [best, p] = step.Best(classes, spaces);
+    const Step step(probabilities + static_cast<std::ptrdiff_t>(t) * classes, classes, spaces);
+    const auto [best, p] = step.Best();
     const bool space = !spaces.empty() && best == spaces.front();
     if (best == 0) {
       if (step.space() > gap_space)
