@@ -6,6 +6,7 @@ import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.OutputFiles;
 import com.quenda.tessel.desktop.Progress;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
+import com.quenda.tessel.desktop.translate.Translator;
 import com.quenda.tessel.desktop.translate.Translators;
 import java.io.PrintStream;
 import java.nio.file.Path;
@@ -27,15 +28,15 @@ public final class PhotoCommand {
   public static void run(CommandLine command, PrintStream out, PrintStream err)
       throws HostException {
     List<PhotoInput> inputs = checkInputs(command.inputs);
-    try (PhotoReader reader = new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES)) {
-      run(command, inputs, reader, out, err);
+    try (PhotoReader reader = new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES);
+         Translator translator =
+             Translators.create(command.from, command.to, command.translations)) {
+      run(command, inputs, new PhotoJob(reader, translator, command.to), out, err);
     }
   }
 
-  private static void run(CommandLine command, List<PhotoInput> inputs, PhotoReader reader,
+  private static void run(CommandLine command, List<PhotoInput> inputs, PhotoJob job,
       PrintStream out, PrintStream err) throws HostException {
-    PhotoJob job = new PhotoJob(
-        reader, Translators.create(command.from, command.to, command.translations), command.to);
     OutputFiles files = new OutputFiles(command.out);
 
     Progress progress = new Progress(STEPS_PER_PHOTO * inputs.size(), command.quiet, err);

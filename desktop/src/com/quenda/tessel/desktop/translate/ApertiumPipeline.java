@@ -1,14 +1,15 @@
 package com.quenda.tessel.desktop.translate;
 
+import com.quenda.tessel.desktop.ChildProcess;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import java.io.IOException;
 import java.io.PrintStream;
-import java.nio.charset.StandardCharsets;
 import java.nio.file.Files;
 import java.nio.file.Path;
 import java.util.ArrayList;
 import java.util.List;
+import java.util.Map;
 
 /**
  * One Apertium translation direction kept running in three parts: analysis, then tagging and
@@ -32,7 +33,7 @@ final class ApertiumPipeline implements AutoCloseable {
   /** The three running parts of {@code mode}, each answering within {@code timeoutMillis}. */
   static ApertiumPipeline start(String mode, long timeoutMillis, PrintStream log)
       throws HostException {
-    String pipeline = nullFlushPipeline(mode);
+    String pipeline = nullFlushPipeline(mode, timeoutMillis);
     List<String> programs = List.of(pipeline.split(" \\| "));
     int generator = -1;
     for (int i = 1; i < programs.size() && generator < 0; i++) {
@@ -81,30 +82,26 @@ final class ApertiumPipeline implements AutoCloseable {
     }
   }
 
-  private static String nullFlushPipeline(String mode) throws HostException {
+  private static String nullFlushPipeline(String mode, long timeoutMillis) throws HostException {
     Path file = MODES.resolve(mode + ".mode");
     if (!Files.isReadable(file)) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "cannot read the Apertium mode file " + file + ": reinstall its Debian package");
     }
+    ChildProcess.Result result;
     try {
-      Process process =
-          NullFlushProcess
-              .withoutPreload(new ProcessBuilder("apertium-wblank-mode", "-z", file.toString()))
-              .redirectErrorStream(true)
-              .start();
-      String text = new String(process.getInputStream().readAllBytes(), StandardCharsets.UTF_8);
-      if (process.waitFor() != 0 || text.isBlank()) {
-        throw new HostException(ExitStatus.MISSING_TRANSLATION,
-            "apertium-wblank-mode failed on " + file + ": " + text.strip());
-      }
-      return text.strip();
+      result = ChildProcess.run("translation",
+          List.of("apertium-wblank-mode", "-z", file.toString()), "", Map.of(), timeoutMillis);
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
           "cannot run apertium-wblank-mode: install the Debian package apertium");
-    } catch (InterruptedException e) {
-      Thread.currentThread().interrupt();
-      throw new HostException(ExitStatus.INTERNAL, "interrupted while reading the mode " + mode);
     }
+    String text = result.stdout.strip();
+    if (result.exitCode != 0 || text.isEmpty()) {
+      throw new HostException(ExitStatus.MISSING_TRANSLATION,
+          "apertium-wblank-mode failed on " + file + ": "
+              + (text + " " + result.stderr.strip()).strip());
+    }
+    return text;
   }
 }

@@ -1,5 +1,6 @@
 package com.quenda.tessel.desktop.translate;
 
+import com.quenda.tessel.desktop.ChildProcess;
 import com.quenda.tessel.desktop.ExitStatus;
 import com.quenda.tessel.desktop.HostException;
 import java.io.ByteArrayOutputStream;
@@ -122,7 +123,7 @@ final class NullFlushProcess implements AutoCloseable {
     stop();
     try {
       ProcessBuilder builder = new ProcessBuilder(command);
-      withoutPreload(builder);
+      ChildProcess.withoutPreload(builder);
       process = builder.start();
     } catch (IOException e) {
       throw new HostException(ExitStatus.MISSING_TRANSLATION,
@@ -155,16 +156,6 @@ final class NullFlushProcess implements AutoCloseable {
     } catch (IOException e) {
       // Gone already.
     }
-  }
-
-  /**
-   * Drops a library preloaded into the host (a sanitizer's runtime in checked builds) from a
-   * child's environment: the child is not ours to check, and would be slowed or stopped by it.
-   */
-  static ProcessBuilder withoutPreload(ProcessBuilder builder) {
-    builder.environment().keySet().removeAll(
-        List.of("LD_PRELOAD", "ASAN_OPTIONS", "UBSAN_OPTIONS"));
-    return builder;
   }
 
   private static void readAnswers(InputStream stream, BlockingQueue<Object> queue) {

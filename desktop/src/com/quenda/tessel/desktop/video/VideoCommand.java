@@ -6,6 +6,7 @@ import com.quenda.tessel.desktop.Json;
 import com.quenda.tessel.desktop.OutputFiles;
 import com.quenda.tessel.desktop.Progress;
 import com.quenda.tessel.desktop.ocr.PhotoReader;
+import com.quenda.tessel.desktop.translate.Translator;
 import com.quenda.tessel.desktop.translate.Translators;
 import java.io.PrintStream;
 
@@ -22,15 +23,16 @@ public final class VideoCommand {
 
   public static VideoResult run(CommandLine command, PrintStream out, PrintStream err)
       throws HostException {
-    try (FrameSource source = FrameSources.open(command.inputs.get(0))) {
-      // Offline, a keyframe holds its frame up: read on every core. Live, it is read beside the
-      // frames being drawn.
-      PhotoReader reader = command.live
-          ? PhotoReader.forLiveVideo(command.from.tesseract)
-          : new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES);
-      VideoJob job =
-          new VideoJob(reader, Translators.create(command.from, command.to, command.translations),
-              command.to, command.live, Long.getLong(OCR_DELAY_PROPERTY, 0));
+    // Offline, a keyframe holds its frame up: read on every core. Live, it is read beside the
+    // frames being drawn.
+    try (FrameSource source = FrameSources.open(command.inputs.get(0));
+         PhotoReader reader = command.live
+             ? PhotoReader.forLiveVideo(command.from.tesseract)
+             : new PhotoReader(command.from.tesseract, PhotoReader.ALL_CORES);
+         Translator translator =
+             Translators.create(command.from, command.to, command.translations)) {
+      VideoJob job = new VideoJob(
+          reader, translator, command.to, command.live, Long.getLong(OCR_DELAY_PROPERTY, 0));
       return run(job, source, command, out, err);
     }
   }
