@@ -2,11 +2,11 @@ package com.quenda.tessel.soak;
 
 import com.quenda.tessel.desktop.HostException;
 import com.quenda.tessel.desktop.Language;
-import com.quenda.tessel.desktop.engine.FontChoice;
 import com.quenda.tessel.desktop.engine.OverlayDrawer;
 import com.quenda.tessel.desktop.scenes.BundledInputs;
 import com.quenda.tessel.desktop.scenes.CameraSequence;
 import com.quenda.tessel.desktop.scenes.SceneLine;
+import com.quenda.tessel.desktop.typeset.Face;
 import java.util.ArrayList;
 import java.util.List;
 import java.util.Objects;
@@ -52,7 +52,7 @@ public final class Soak {
     TrackedLines lines = null;
     try (OverlayDrawer drawer =
              new OverlayDrawer((int) camera.frameSize().width, (int) camera.frameSize().height)) {
-      drawer.setLanguage(Language.of("es"), FontChoice.Weight.REGULAR);
+      drawer.setLanguage(Language.of("es"), Face.SANS);
       for (int k = 0; k < frames; k++) {
         int view = sweep(k);
         Mat rgb = camera.frame(view);

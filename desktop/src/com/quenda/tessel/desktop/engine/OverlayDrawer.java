@@ -38,11 +38,6 @@ public final class OverlayDrawer implements AutoCloseable {
     }
   }
 
-  /** Texts from now on are in {@code language}, in the font the host picks for its script. */
-  public void setLanguage(Language language, FontChoice.Weight weight) {
-    bindFont(language, FontChoice.platformFont(language, weight));
-  }
-
   /**
    * Texts from now on are in {@code language}, in {@code face} (CJK scripts keep the engine's
    * font). Text objects already built keep their font until they are retired.

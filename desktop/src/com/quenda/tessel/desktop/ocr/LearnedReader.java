@@ -41,26 +41,19 @@ public final class LearnedReader implements AutoCloseable {
   private long handle;
 
   /**
-   * Loads the models from {@code modelDir}. A model missing or broken is a MISSING_OCR_DATA
-   * failure naming the file and what mends it.
+   * Loads the models from {@code modelDir}, for one thread and the default scene side. A model
+   * missing or broken is a MISSING_OCR_DATA failure naming the file and what mends it.
    */
   public LearnedReader(Path modelDir, Script script, int detectionLongSide, boolean recognise)
       throws HostException {
-    this(modelDir, script, detectionLongSide, recognise, 1);
+    this(modelDir, script, detectionLongSide, SCENE_LONG_SIDE, recognise, 1);
   }
 
   /**
-   * With {@code threads} threads per network run (0: as many as the machine has cores): a photo
-   * is read fastest on all of them; a live video's reading on one leaves the others to the frames.
-   */
-  public LearnedReader(Path modelDir, Script script, int detectionLongSide, boolean recognise,
-      int threads) throws HostException {
-    this(modelDir, script, detectionLongSide, SCENE_LONG_SIDE, recognise, threads);
-  }
-
-  /**
-   * With the scene's long side given ({@link #SCENE_LONG_SIDE}, or 0 to look once, at {@code
-   * detectionLongSide}: half the detector's time on a 720p frame, fewer small words found).
+   * With the scene's long side ({@link #SCENE_LONG_SIDE}, or 0 to look once, at {@code
+   * detectionLongSide}: half the detector's time on a 720p frame, fewer small words found) and
+   * {@code threads} threads per network run (0: as many as the machine has cores): a photo is
+   * read fastest on all of them; a live video's reading on one leaves the others to the frames.
    */
   public LearnedReader(Path modelDir, Script script, int detectionLongSide, int sceneLongSide,
       boolean recognise, int threads) throws HostException {

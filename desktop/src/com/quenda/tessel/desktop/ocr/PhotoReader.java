@@ -267,8 +267,11 @@ public final class PhotoReader implements AutoCloseable {
   private static double edgeMean(Mat grey) {
     int w = grey.cols();
     int h = grey.rows();
-    double sum = Core.sumElems(grey.row(0)).val[0] + Core.sumElems(grey.row(h - 1)).val[0]
-        + Core.sumElems(grey.col(0)).val[0] + Core.sumElems(grey.col(w - 1)).val[0];
+    double sum = 0;
+    for (Mat edge : List.of(grey.row(0), grey.row(h - 1), grey.col(0), grey.col(w - 1))) {
+      sum += Core.sumElems(edge).val[0];
+      edge.release(); // a header on the crop's pixels, freed now rather than by the collector
+    }
     return sum / (2.0 * w + 2.0 * h);
   }
 }

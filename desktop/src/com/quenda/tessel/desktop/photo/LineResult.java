@@ -3,6 +3,7 @@ package com.quenda.tessel.desktop.photo;
 import com.quenda.tessel.desktop.ocr.RecognizedLine;
 import com.quenda.tessel.desktop.typeset.Align;
 import com.quenda.tessel.desktop.typeset.Face;
+import com.quenda.tessel.desktop.typeset.Typesetter;
 import java.util.LinkedHashMap;
 import java.util.Map;
 
@@ -21,18 +22,23 @@ public final class LineResult {
   public final int block;
   /** The drawn capitals' height over the original's; 0 when not drawn. */
   public final double sizeRatio;
-  /** Null for a line translated on its own. */
   public final Align align;
   /** Null where not translated, and for CJK translations (drawn in the engine's own font). */
   public final Face face;
 
-  /** A line translated on its own (video keyframes): no block, size, alignment or face. */
-  public LineResult(RecognizedLine line, String translation, int color) {
-    this(line, translation, color, -1, 0, null, null);
+  /**
+   * Line {@code i} as {@code typeset} set it, with the text colour {@code color} it was erased with
+   * (0 where not translated).
+   */
+  public static LineResult of(RecognizedLine line, Typesetter.Typeset typeset, int i, int color) {
+    Typesetter.SetLine set = typeset.lines().get(i);
+    Typesetter.SetBlock block = typeset.blocks().get(set.block());
+    return new LineResult(
+        line, set.text(), color, set.block(), set.sizeRatio(), block.block().align, block.face());
   }
 
-  public LineResult(RecognizedLine line, String translation, int color, int block, double sizeRatio,
-      Align align, Face face) {
+  private LineResult(RecognizedLine line, String translation, int color, int block,
+      double sizeRatio, Align align, Face face) {
     this.line = line;
     this.translation = translation;
     this.color = color;
@@ -57,12 +63,10 @@ public final class LineResult {
     json.put("color", translated() ? hex(color) : null);
     json.put("confidence", Math.round(line.confidence));
     json.put("reader", line.reader);
-    if (align != null) {
-      json.put("block", block);
-      json.put("size_ratio", translated() ? Math.round(sizeRatio * 1000) / 1000.0 : null);
-      json.put("align", align.label);
-      json.put("face", translated() && face != null ? face.label : null);
-    }
+    json.put("block", block);
+    json.put("size_ratio", translated() ? Math.round(sizeRatio * 1000) / 1000.0 : null);
+    json.put("align", align.label);
+    json.put("face", translated() && face != null ? face.label : null);
     return json;
   }
 

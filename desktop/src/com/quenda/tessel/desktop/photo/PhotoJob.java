@@ -84,11 +84,8 @@ public final class PhotoJob {
 
     List<LineResult> results = new ArrayList<>();
     for (int i = 0, k = 0; i < lines.size(); i++) {
-      Typesetter.SetLine set = typeset.lines().get(i);
-      Typesetter.SetBlock block = typeset.blocks().get(set.block());
-      boolean translated = set.text() != null;
-      results.add(new LineResult(lines.get(i), set.text(), translated ? patches.colors[k++] : 0,
-          set.block(), set.sizeRatio(), block.block().align, block.face()));
+      boolean translated = typeset.lines().get(i).text() != null;
+      results.add(LineResult.of(lines.get(i), typeset, i, translated ? patches.colors[k++] : 0));
     }
     return new PhotoResult(input, rgb, drawn, results, typeset.blocks(), times);
   }

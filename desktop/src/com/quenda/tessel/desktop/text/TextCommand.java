@@ -77,7 +77,10 @@ public final class TextCommand {
     return false;
   }
 
-  /** The line as text (a final carriage return and NUL bytes dropped), or null when not UTF-8. */
+  /**
+   * The line as text (a final carriage return dropped, NUL bytes made spaces), or null when not
+   * UTF-8.
+   */
   private static String decode(byte[] bytes) {
     try {
       String text = StandardCharsets.UTF_8.newDecoder()

@@ -63,7 +63,17 @@ final class SignRules {
    * Words of British signs whose sign sense Apertium's dictionary gives only under another
    * English word: the lift is a machine, not a push.
    */
-  private static final Map<String, String> SIGN_SYNONYMS = Map.of("lift<n>", "elevator<n>");
+  private static final List<Synonym> SIGN_SYNONYMS = List.of(Synonym.of("lift<n>", "elevator<n>"));
+
+  /** A word with its tags ("lift<n>"), matched in a unit's readings, and its sign sense. */
+  private record Synonym(Pattern reading, String tags, String sense) {
+    static Synonym of(String word, String sense) {
+      String lemma = word.substring(0, word.indexOf('<'));
+      String tags = word.substring(lemma.length());
+      return new Synonym(Pattern.compile("/(?i:" + lemma + ")" + Pattern.quote(tags)), tags,
+          sense.substring(0, sense.indexOf('<')));
+    }
+  }
 
   /** The definite article's lemma, for "Prohibida la entrada". */
   private static final Map<String, String> ARTICLE = Map.of("es", "el", "gl", "o", "ca", "el");
@@ -136,7 +146,7 @@ final class SignRules {
       }
       // Text the memory translated opens the line: what follows it does not start the sign.
       if (units.size() == 0 || units.pieces.get(0).matches("^\\[.+")) {
-        return stream.equals(units.toString()) ? stream : units.toString();
+        return units.toString();
       }
       List<String> first = LexicalUnits.readings(units.get(0));
       String next =
@@ -268,15 +278,12 @@ final class SignRules {
 
   /** The sign sense of an ambiguous English word, given as the word that has it alone. */
   private static String signSense(String unit) {
-    for (Map.Entry<String, String> synonym : SIGN_SYNONYMS.entrySet()) {
-      String word = synonym.getKey().substring(0, synonym.getKey().indexOf('<'));
-      String tags = synonym.getKey().substring(word.length());
-      String sense = synonym.getValue().substring(0, synonym.getValue().indexOf('<'));
-      Matcher m = Pattern.compile("/(?i:" + word + ")" + Pattern.quote(tags)).matcher(unit);
+    for (Synonym synonym : SIGN_SYNONYMS) {
+      Matcher m = synonym.reading().matcher(unit);
       if (m.find()) {
         boolean capital = Character.isUpperCase(unit.charAt(m.start() + 1));
-        return m.replaceAll(
-            Matcher.quoteReplacement("/" + (capital ? upperFirst(sense) : sense) + tags));
+        return m.replaceAll(Matcher.quoteReplacement(
+            "/" + (capital ? upperFirst(synonym.sense()) : synonym.sense()) + synonym.tags()));
       }
     }
     return unit;

@@ -54,7 +54,7 @@ public final class BlockFinder {
     for (List<Integer> group : groups) {
       blocks.add(block(lines, group));
     }
-    // In reading order: top to bottom, then left to right.
+    // In reading order: by where their first line stands, top to bottom along the lines' axis.
     blocks.sort(Comparator.comparingInt((Block b) -> order.indexOf(b.lines.get(0))));
     return blocks;
   }

@@ -26,12 +26,4 @@ public enum Face {
     }
     return bold ? SANS_BOLD : SANS;
   }
-
-  public boolean serif() {
-    return this == SERIF || this == SERIF_BOLD;
-  }
-
-  public boolean bold() {
-    return this == SANS_BOLD || this == SERIF_BOLD;
-  }
 }

@@ -84,11 +84,6 @@ public final class TextMetrics {
     return text.isBlank() ? kind : kind.union(ink(text, kind));
   }
 
-  /** The height of the ink box for {@code text}'s kind, without its own ink. */
-  public double kindHeight(String text) {
-    return kindBox(text).height();
-  }
-
   /** The capitals' height, or the ideographs' in CJK: what a reader sees as the text's size. */
   public double capHeight() {
     return cjk ? ideographs.height() : capitals.top;

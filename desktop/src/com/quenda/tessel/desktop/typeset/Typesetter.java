@@ -48,10 +48,6 @@ public final class Typesetter {
     List<String> translations = stripped(translator.translate(sources));
     List<String> byLine = byLine(blocks, translations, lines);
 
-    List<InkEnds.Cover> covers = new ArrayList<>();
-    for (RecognizedLine line : lines) {
-      covers.add(InkEnds.of(rgb, line.rect));
-    }
     SetLine[] set = new SetLine[lines.size()];
     List<SetBlock> setBlocks = new ArrayList<>();
     for (int b = 0; b < blocks.size(); b++) {
@@ -63,15 +59,18 @@ public final class Typesetter {
       }
       if (whole == null && perLine.stream().allMatch(t -> t == null)) {
         for (int i : block.lines) {
-          set[i] = new SetLine(b, null, covers.get(i).erase(), lines.get(i).rect, 0);
+          // Left as it stands: nothing erased, so no need to find its ink's ends.
+          set[i] = new SetLine(b, null, lines.get(i).rect, lines.get(i).rect, 0);
         }
         setBlocks.add(new SetBlock(block, sources.get(b), null, null, false));
         continue;
       }
+      List<InkEnds.Cover> covers = new ArrayList<>();
       List<RotatedRect> spans = new ArrayList<>();
       List<RotatedRect> inks = new ArrayList<>();
       for (int i : block.lines) {
-        spans.add(covers.get(i).along());
+        covers.add(InkEnds.of(rgb, lines.get(i).rect));
+        spans.add(covers.get(covers.size() - 1).along());
         inks.add(lines.get(i).rect);
       }
       Face face = FaceDetector.detect(rgb, inks);
@@ -84,7 +83,7 @@ public final class Typesetter {
         int i = block.lines.get(k);
         BlockLayout.Placed placed = layout.lines().get(k);
         set[i] = new SetLine(
-            b, placed.text(), covers.get(i).erase(), placed.textRect(), placed.sizeRatio());
+            b, placed.text(), covers.get(k).erase(), placed.textRect(), placed.sizeRatio());
       }
       String translation = whole != null ? whole : SourceText.join(nonNull(perLine));
       setBlocks.add(new SetBlock(

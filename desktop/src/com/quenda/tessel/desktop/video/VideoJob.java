@@ -410,7 +410,13 @@ public final class VideoJob {
       }
       LiveKeyframe done = working;
       working = null;
-      CaughtUp caughtUp = result(done.result);
+      CaughtUp caughtUp;
+      try {
+        caughtUp = result(done.result);
+      } catch (HostException | RuntimeException | Error e) {
+        done.releaseFrames(); // nobody else holds them now
+        throw e;
+      }
       if (done.givenUp) {
         caughtUp.release();
         done.releaseFrames();
@@ -601,10 +607,11 @@ public final class VideoJob {
     }
 
     /**
-     * Draws {@code visible} one pass per face, as a photo is: the renderer builds a line's text in
-     * the font bound when it first meets the line's patch id and keeps it, so a keyframe of one
-     * face (the usual case) costs one pass and one font binding per keyframe, and each further
-     * face one more pass over what the passes before drew.
+     * Draws {@code visible} one pass per face, as a photo is: the renderer builds a text object in
+     * the font bound when it first meets that text, and keeps reusing it (font included) while the
+     * text stays on screen. A keyframe of one face (the usual case) costs one pass and one font
+     * binding per keyframe, and each further face one more pass over what the passes before drew.
+     * A text already shown in one face and then asked for in another keeps the first.
      */
     private Mat drawByFace(Mat frame, List<ShownLine> visible) throws HostException {
       Map<Face, List<ShownLine>> byFace = new LinkedHashMap<>();
@@ -687,13 +694,9 @@ public final class VideoJob {
     private Map<String, Object> keyframeJson(KeyframeWork.Result result, String reason) {
       List<Object> lines = new ArrayList<>();
       for (int i = 0, p = 0; i < result.lines().size(); i++) {
-        Typesetter.SetLine set = result.typeset().lines().get(i);
-        Typesetter.SetBlock block = result.typeset().blocks().get(set.block());
-        boolean translated = set.text() != null;
-        lines.add(new LineResult(result.lines().get(i), set.text(),
-            translated ? result.patches().colors[p++] : 0, set.block(), set.sizeRatio(),
-            block.block().align, block.face())
-                      .json());
+        boolean translated = result.typeset().lines().get(i).text() != null;
+        int color = translated ? result.patches().colors[p++] : 0;
+        lines.add(LineResult.of(result.lines().get(i), result.typeset(), i, color).json());
       }
       Map<String, Object> json = new LinkedHashMap<>();
       json.put("frame", result.frame());
@@ -718,7 +721,9 @@ public final class VideoJob {
 
     void release() {
       if (worker != null) {
-        worker.shutdownNow();
+        // Lets a keyframe already handed over run to its end, so that its result is freed here;
+        // one dropped from the queue unrun would leave get() waiting for ever.
+        worker.shutdown();
         try {
           if (working != null) {
             working.result.get().release();

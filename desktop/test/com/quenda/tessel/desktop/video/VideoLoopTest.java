@@ -20,6 +20,7 @@ import java.nio.file.Path;
 import java.util.List;
 import java.util.Map;
 import java.util.concurrent.CountDownLatch;
+import java.util.concurrent.Semaphore;
 import java.util.concurrent.TimeUnit;
 import java.util.concurrent.atomic.AtomicBoolean;
 import org.junit.jupiter.api.AfterAll;
@@ -184,6 +185,8 @@ class VideoLoopTest {
     int releaseAt = 30;
     CountDownLatch ocrMayFinish = new CountDownLatch(1);
     AtomicBoolean releasedByTheClock = new AtomicBoolean();
+    Semaphore keyframeDone = new Semaphore(0);
+    AtomicBoolean keyframeWaited = new AtomicBoolean();
     KeyframeWork.AfterOcr held = frame -> {
       // Breaks the deadlock of a loop that waits for the OCR; the assertion below then fails.
       releasedByTheClock.compareAndSet(false, ocrMayFinish.await(60, TimeUnit.SECONDS));
@@ -193,9 +196,16 @@ class VideoLoopTest {
       public void awaitFrame(int k) throws InterruptedException {
         if (k == releaseAt) {
           ocrMayFinish.countDown();
-        } else if (k > releaseAt) {
-          Thread.sleep(150); // time for translating, erasing and catching up, also under ASan
+        } else if (k == releaseAt + 1) {
+          // The next frame comes once the keyframe's translating, erasing and catching up are
+          // done (bounded, so that a keyframe never done fails the test instead of hanging it).
+          keyframeWaited.set(keyframeDone.tryAcquire(60, TimeUnit.SECONDS));
         }
+      }
+
+      @Override
+      public void keyframeDone(int k) {
+        keyframeDone.release();
       }
 
       @Override
@@ -209,6 +219,7 @@ class VideoLoopTest {
     VideoResult result = run(job, source(steady, 15), dir.resolve("live"), true);
 
     assertTrue(releasedByTheClock.get(), "a frame before " + releaseAt + " waited for the OCR");
+    assertTrue(keyframeWaited.get(), "the first keyframe's work was never reported done");
     int firstDrawn = -1;
     int drawn = 0;
     for (FrameRecord record : result.records) {
